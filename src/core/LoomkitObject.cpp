@@ -1,0 +1,6 @@
+#include "LoomkitObject.h"
+
+LoomkitObject::LoomkitObject(QObject *parent)
+    : QObject(parent)
+{
+}

@@ -1,0 +1,55 @@
+<?xml version="1.0" encoding="utf-8"?>
+<!DOCTYPE TS>
+<TS version="2.1" language="pt_BR">
+<context>
+    <name>QObject</name>
+    <message>
+        <source>Cancel</source>
+        <translation>Cancelar</translation>
+    </message>
+    <message>
+        <source>No default xml was provided for app configuration.</source>
+        <translation>Nenhum XML padrão foi fornecido para a configuração do aplicativo.</translation>
+    </message>
+    <message>
+        <source>No key found for com.apple.configuration.managed.</source>
+        <translation>Nenhuma chave encontrada para com.apple.configuration.managed.</translation>
+    </message>
+    <message>
+        <source>OK</source>
+        <translation>OK</translation>
+    </message>
+    <message>
+        <source>Open in </source>
+        <translation>Abrir no </translation>
+    </message>
+    <message>
+        <source>Select from options</source>
+        <translation>Selecione uma das opções</translation>
+    </message>
+    <message>
+        <source>Share Via</source>
+        <translation>Compartilhar via</translation>
+    </message>
+    <message>
+        <source>This platform does not support managed app configuration through MDM.</source>
+        <translation>Esta plataforma não oferece suporte à configuração de aplicativos gerenciados por MDM.</translation>
+    </message>
+    <message>
+        <source>Unsupported data type</source>
+        <translation>Tipo de dados não suportado</translation>
+    </message>
+    <message>
+        <source>Unsupported operation</source>
+        <translation>Operação não suportada</translation>
+    </message>
+    <message>
+        <source>Unsupported platform</source>
+        <translation>Plataforma não suportada</translation>
+    </message>
+    <message>
+        <source>View</source>
+        <translation>Visualizar</translation>
+    </message>
+</context>
+</TS>
