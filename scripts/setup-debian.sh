@@ -8,6 +8,7 @@ PACKAGES="
  qtpositioning5-dev libqt5svg5-dev
  qml-module-qtquick2 qml-module-qtquick-window2 qml-module-qtquick-layouts
  qml-module-qtquick-controls2 qml-module-qttest qml-module-qtqml-models2
+ qml-module-qt-labs-folderlistmodel
  qt5-image-formats-plugins
  zlib1g-dev libminizip-dev
  zip unzip libimage-exiftool-perl exiv2

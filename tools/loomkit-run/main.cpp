@@ -11,6 +11,8 @@
 #include <QQmlComponent>
 #include <QQuickItem>
 #include <QQuickWindow>
+#include <QPixmap>
+#include <QScreen>
 #include <QTimer>
 
 #include <cstdio>
@@ -28,6 +30,9 @@ int main(int argc, char *argv[])
 {
     if (qEnvironmentVariableIsEmpty("QT_QPA_PLATFORM") && !hasDisplay())
         qputenv("QT_QPA_PLATFORM", "offscreen");
+    // The offscreen platform has no OpenGL: render with the software backend.
+    if (qgetenv("QT_QPA_PLATFORM") == "offscreen" && qEnvironmentVariableIsEmpty("QT_QUICK_BACKEND"))
+        QQuickWindow::setSceneGraphBackend(QSGRendererInterface::Software);
 
     QGuiApplication app(argc, argv);
     QCoreApplication::setApplicationName(QStringLiteral("loomkit-run"));
@@ -93,7 +98,11 @@ int main(int argc, char *argv[])
         const QString screenshot = parser.value(screenshotOption);
         QTimer::singleShot(delay, &app, [&]() {
             if (!screenshot.isEmpty()) {
-                const QImage image = window->grabWindow();
+                QImage image = window->grabWindow();
+                // The software backend cannot always grab; the screen holds
+                // what was last painted.
+                if (image.isNull() && window->screen())
+                    image = window->screen()->grabWindow(window->winId()).toImage();
                 if (image.isNull() || !image.save(screenshot)) {
                     std::fprintf(stderr, "loomkit-run: could not save %s\n", qPrintable(screenshot));
                     exitCode = 1;
