@@ -18,6 +18,7 @@
 #include <QQuickItem>
 #include <QQuickWindow>
 #include <QRegularExpression>
+#include <QPixmap>
 #include <QScreen>
 #include <QSslSocket>
 #include <QSysInfo>
@@ -30,6 +31,18 @@ Loomkit *s_instance = nullptr;
 constexpr double kReferenceDotsPerInch = 96.0;
 constexpr int kKeyMask = 0x01FFFFFF;
 constexpr int kModifierMask = int(0xFE000000);
+
+// A singleton reaches script as a type wrapper, not as a QObject value; its
+// variant still holds the object.
+QObject *asObject(const QJSValue &value)
+{
+    if (value.isQObject())
+        return value.toQObject();
+    if (!value.isObject() || value.isCallable())
+        return nullptr;
+    const QVariant variant = value.toVariant();
+    return variant.userType() == QMetaType::QObjectStar ? variant.value<QObject *>() : nullptr;
+}
 
 QGuiApplication *guiApplication()
 {
@@ -454,8 +467,8 @@ QString Loomkit::typeOf(const QJSValue &value, bool displayName)
     if (value.isString())
         return QStringLiteral("string");
 
-    if (value.isQObject()) {
-        QObject *object = value.toQObject();
+    QObject *object = asObject(value);
+    if (object || value.isQObject()) {
         QString name = object ? QString::fromLatin1(object->metaObject()->className()) : QStringLiteral("null");
         if (displayName) {
             static const QRegularExpression typeTail(QStringLiteral("_QMLTYPE_\\d+"));
@@ -528,7 +541,7 @@ bool Loomkit::instanceOf(const QJSValue &value, const QJSValue &type)
     if (typeOf(value, false) == name)
         return true;
 
-    QObject *object = value.isQObject() ? value.toQObject() : nullptr;
+    QObject *object = asObject(value);
     if (!object)
         return false;
     const QByteArray latinName = name.toLatin1();
@@ -571,6 +584,10 @@ QImage Loomkit::grabWindowImage(const QRect &rect) const
     if (!quickWindow)
         return QImage();
     QImage image = quickWindow->grabWindow();
+    // The software scene graph cannot always grab; the screen then holds
+    // what was last painted.
+    if (image.isNull() && quickWindow->screen())
+        image = quickWindow->screen()->grabWindow(quickWindow->winId()).toImage();
     if (!rect.isEmpty() && !rect.isNull())
         image = image.copy(rect);
     return image;
