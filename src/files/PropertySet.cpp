@@ -27,6 +27,7 @@ bool sameValue(const QVariant &a, const QVariant &b)
 
 PropertySet::PropertySet(QObject *parent)
     : QQmlPropertyMap(this, parent)
+    , m_typeMetaObject(&PropertySet::staticMetaObject)
 {
     init();
 }
@@ -44,7 +45,7 @@ bool PropertySet::isValidKey(const QString &key)
 bool PropertySet::isMemberName(const QString &key) const
 {
     // A key named like a property or method would shadow it in QML.
-    const QMetaObject *mo = metaObject();
+    const QMetaObject *mo = m_typeMetaObject;
     while (mo && mo != &QQmlPropertyMap::staticMetaObject) {
         const QByteArray name = key.toUtf8();
         if (mo->indexOfProperty(name.constData()) >= 0)

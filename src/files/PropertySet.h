@@ -42,6 +42,7 @@ protected:
     template <class DerivedType>
     PropertySet(DerivedType *derived, QObject *parent)
         : QQmlPropertyMap(derived, parent)
+        , m_typeMetaObject(&DerivedType::staticMetaObject)
     {
         init();
     }
@@ -51,6 +52,10 @@ protected:
 private:
     void init();
     bool isMemberName(const QString &key) const;
+
+    // The class's own meta-object: the dynamic one in front of it makes up
+    // a property for any name it is asked about.
+    const QMetaObject *m_typeMetaObject = nullptr;
 };
 
 #endif // PROPERTYSET_H

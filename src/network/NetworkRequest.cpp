@@ -1014,7 +1014,10 @@ void NetworkRequest::onFinished(QNetworkReply *reply)
     updateStatus(reply);
 
     if (m_redirectMode == 2 && isRedirectStatus(m_status)) {
-        const QString target = reply->attribute(QNetworkRequest::RedirectionTargetAttribute).toUrl().toString();
+        QString target = reply->attribute(QNetworkRequest::RedirectionTargetAttribute).toUrl().toString();
+        // The manager gives no target for 305; its Location says the same.
+        if (target.isEmpty())
+            target = QString::fromUtf8(reply->rawHeader("Location"));
         // Without a Location there is nowhere to go: resolving an empty
         // reference would give this same URL again, for ever.
         const QUrl redirectUrl = target.isEmpty() ? QUrl()
