@@ -56,11 +56,10 @@ bool PropertySet::isMemberName(const QString &key) const
         }
         mo = mo->superClass();
     }
-    static const QStringList reserved = { QStringLiteral("objectName"), QStringLiteral("valueChanged"),
-                                          QStringLiteral("destroyed"), QStringLiteral("deleteLater"),
-                                          QStringLiteral("insert"), QStringLiteral("isEmpty"),
-                                          QStringLiteral("count"), QStringLiteral("size"),
-                                          QStringLiteral("contains") };
+    // What QQmlPropertyMap and QObject show to QML.
+    static const QStringList reserved = { QStringLiteral("objectName"), QStringLiteral("objectNameChanged"),
+                                          QStringLiteral("valueChanged"), QStringLiteral("destroyed"),
+                                          QStringLiteral("deleteLater") };
     return reserved.contains(key);
 }
 
