@@ -944,7 +944,7 @@ bool NetworkRequest::openResponseFile()
     if (QFile::exists(path))
         QFile::remove(path);
     auto *file = new QFile(path, this);
-    if (!file->open(QIODevice::ReadWrite)) {
+    if (!file->open(QIODevice::ReadWrite | QIODevice::Unbuffered)) {
         qCWarning(lcNetwork) << Q_FUNC_INFO << "Cannot open" << path << file->errorString();
         delete file;
         m_responseFileFailed = true;
