@@ -37,6 +37,8 @@ void cookies(const QByteArray &data)
 {
     QVariantMap headers;
     headers.insert(QStringLiteral("Cookie"), QString::fromUtf8(data));
+    // A fresh jar for each input, so that memory does not grow with the run.
+    manager->setCookieJar(new QNetworkCookieJar);
     NetworkRequest::setCookies(manager, QUrl(QStringLiteral("http://127.0.0.1:8080/a/b")), headers);
 }
 
