@@ -45,6 +45,20 @@ QVariant frameworkProperty(const char *name)
     return framework ? framework->property(name) : QVariant();
 }
 
+// The page cache takes a large write much more slowly than the same bytes
+// in small ones, so a chunk goes to the file in slices.
+bool writeInSlices(QFile *file, const QByteArray &chunk)
+{
+    constexpr int kSlice = 64 * 1024;
+    const char *data = chunk.constData();
+    for (int done = 0; done < chunk.size(); done += kSlice) {
+        const int length = qMin(kSlice, chunk.size() - done);
+        if (file->write(data + done, length) != length)
+            return false;
+    }
+    return true;
+}
+
 bool containsNullWord(const QByteArray &data)
 {
     // "null" in any case, without a lower-cased copy of the whole body.
@@ -963,7 +977,7 @@ void NetworkRequest::appendResponseData(const QByteArray &chunk)
         openResponseFile();
 
     if (m_responseFile) {
-        if (m_responseFile->write(chunk) != chunk.size()) {
+        if (!writeInSlices(m_responseFile, chunk)) {
             // A full disk must not pass for a complete download.
             qCWarning(lcNetwork) << Q_FUNC_INFO << "Cannot write" << m_responseFile->fileName()
                                  << m_responseFile->errorString();
