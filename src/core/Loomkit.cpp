@@ -1,6 +1,7 @@
 #include "Loomkit.h"
 #include "FileUtility.h"
 #include "LoomkitLogging.h"
+#include "Network.h"
 #include "platform/AppUtilsPrivate.h"
 
 #include <QClipboard>
@@ -79,6 +80,8 @@ Loomkit::Loomkit(QObject *parent)
         connect(screen, &QScreen::logicalDotsPerInchChanged, this, &Loomkit::onLogicalDotsPerInchChanged);
     }
 
+    network();
+
     m_appUtils = AppUtilsPrivate::create(this);
 }
 
@@ -95,6 +98,30 @@ Loomkit *Loomkit::instance(QQmlEngine *engine)
         s_instance = new Loomkit(engine);
     qCDebug(lcPlugin) << Q_FUNC_INFO << s_instance;
     return s_instance;
+}
+
+// Networking (subsystem 4)
+
+Loomkit *Loomkit::current()
+{
+    return s_instance;
+}
+
+Network *Loomkit::network()
+{
+    if (!m_network) {
+        m_network = new Network(this);
+        connect(m_network, &Network::onlineStateChanged, this, &Loomkit::onlineStateChanged);
+    }
+    return m_network;
+}
+
+bool Loomkit::isOnline()
+{
+    qCCritical(lcNetwork) << "*** DEPRECATED. Use Networking.isOnline instead. ***";
+    // Network::isOnline logs the same line again; answer for it instead.
+    network();
+    return true;
 }
 
 QQmlEngine *Loomkit::engine() const

@@ -16,6 +16,7 @@ class QQuickItem;
 class QQuickWindow;
 class QImage;
 class AppUtilsPrivate;
+class Network;
 
 // The module's one QML singleton, shared by every engine of the process.
 class Loomkit : public QObject
@@ -38,6 +39,9 @@ class Loomkit : public QObject
     Q_PROPERTY(QString currentCpuArchitecture READ currentCpuArchitecture CONSTANT)
     Q_PROPERTY(QVariantMap systemInformation READ systemInformation CONSTANT)
     Q_PROPERTY(double displayScaleFactor READ displayScaleFactor WRITE setDisplayScaleFactor NOTIFY displayScaleFactorChanged)
+    // Networking (subsystem 4)
+    Q_PROPERTY(Network *network READ network CONSTANT)
+    Q_PROPERTY(bool isOnline READ isOnline NOTIFY onlineStateChanged)
     Q_PROPERTY(QStringList importPathList READ importPathList WRITE setImportPathList NOTIFY importPathListChanged)
     Q_PROPERTY(QString defaultLocale READ defaultLocale WRITE setDefaultLocale NOTIFY defaultLocaleChanged)
     Q_PROPERTY(QStringList availableLocaleNames READ availableLocaleNames CONSTANT)
@@ -48,6 +52,12 @@ public:
     ~Loomkit() override;
 
     static Loomkit *instance(QQmlEngine *engine);
+
+    // Networking (subsystem 4)
+    // The process-wide object if one exists; never creates it.
+    static Loomkit *current();
+    Network *network();
+    bool isOnline();
 
     QString userHomePath();
     void setUserHomePath(const QString &path);
@@ -131,6 +141,8 @@ private:
     QDir m_userHome;
     double m_displayScaleFactor = 0;
     QStringList m_availableLocaleNames;
+    // Networking (subsystem 4)
+    Network *m_network = nullptr;
     AppUtilsPrivate *m_appUtils = nullptr;
 };
 

@@ -3,6 +3,13 @@
 #include "LoomkitError.h"
 #include "LoomkitLogging.h"
 #include "LoomkitObject.h"
+// Networking (subsystem 4) and property sets (subsystem 2)
+#include "AuthenticationChallenge.h"
+#include "Network.h"
+#include "NetworkProxy.h"
+#include "NetworkRequest.h"
+#include "NetworkRequestHeaders.h"
+#include "PropertySet.h"
 
 #include <QCoreApplication>
 #include <QLocale>
@@ -49,6 +56,14 @@ void LoomkitPlugin::registerTypes(const char *uri)
     qmlRegisterSingletonType<Loomkit>(uri, 1, 0, "Loomkit", &LoomkitPlugin::loomkitProvider);
     registerUncreatable<LoomkitObject>(uri, "LoomkitObject", "The Orvane type LoomkitObject is not creatable");
     registerUncreatable<LoomkitError>(uri, "LoomkitError", "The Orvane type LoomkitError is not creatable");
+    // rows 13-16 and 19: networking
+    registerUncreatable<Network>(uri, "Network", "The Orvane type Network is not creatable");
+    registerUncreatable<NetworkProxy>(uri, "NetworkProxy", "The Orvane type NetworkProxy is not creatable");
+    qmlRegisterType<NetworkRequest>(uri, 1, 0, "NetworkRequest");
+    qmlRegisterType<NetworkRequestHeaders>(uri, 1, 0, "NetworkRequestHeaders");
+    qmlRegisterType<AuthenticationChallenge>(uri, 1, 0, "AuthenticationChallenge");
+    // row 38
+    qmlRegisterType<PropertySet>(uri, 1, 0, "PropertySet");
 }
 
 void LoomkitPlugin::initializeNetwork()

@@ -6,6 +6,9 @@
 #include <QVariant>
 #include <QtQuickTest>
 
+#include "NetworkingPrivate.h"
+#include "TestHttpServer.h"
+
 class TranslatorManager : public QObject
 {
     Q_OBJECT
@@ -52,6 +55,12 @@ public slots:
         auto *manager = new TranslatorManager(QCoreApplication::instance());
         QCoreApplication::instance()->setProperty("Orvane.Loomkit.TranslatorManager",
                                                   QVariant::fromValue<QObject *>(manager));
+        // The host publishes its network service before any request exists;
+        // on this thread, so that requests can query it directly.
+        NetworkingPrivate::publish();
+        m_server = new TestHttpServer(QCoreApplication::instance());
+        if (!m_server->start())
+            qWarning("Cannot start the loopback HTTP server");
     }
 
     void qmlEngineAvailable(QQmlEngine *engine)
@@ -61,7 +70,11 @@ public slots:
             QCoreApplication::instance()->property("Orvane.Loomkit.TranslatorManager").value<QObject *>());
         engine->rootContext()->setContextProperty(QStringLiteral("testDataFolder"),
                                                   qEnvironmentVariable("LOOMKIT_TEST_DATA"));
+        engine->rootContext()->setContextProperty(QStringLiteral("testHttpServer"), m_server);
     }
+
+private:
+    TestHttpServer *m_server = nullptr;
 };
 
 QUICK_TEST_MAIN_WITH_SETUP(loomkit, Setup)

@@ -1,6 +1,8 @@
 // loomkit-run: runs a QML file with the Orvane.Loomkit module, as a host
 // application would. Without a display it runs offscreen; it can save a PNG
 // of the window and quit after a given time, so that demos run headless.
+#include "LocalHttpServer.h"
+#include "NetworkingPrivate.h"
 #include "TranslatorManager.h"
 
 #include <QCommandLineParser>
@@ -9,6 +11,7 @@
 #include <QGuiApplication>
 #include <QQmlApplicationEngine>
 #include <QQmlComponent>
+#include <QQmlContext>
 #include <QQuickItem>
 #include <QQuickWindow>
 #include <QPixmap>
@@ -48,7 +51,11 @@ int main(int argc, char *argv[])
                                         QStringLiteral("Saves a PNG of the window before quitting."), QStringLiteral("png"));
     QCommandLineOption quitOption(QStringLiteral("quit-after"),
                                   QStringLiteral("Quits after this many milliseconds."), QStringLiteral("ms"));
+    QCommandLineOption serveOption(QStringLiteral("serve"),
+                                   QStringLiteral("Serves a folder over HTTP on 127.0.0.1 (QML: hostServer.url)."),
+                                   QStringLiteral("folder"));
     parser.addOption(importOption);
+    parser.addOption(serveOption);
     parser.addOption(screenshotOption);
     parser.addOption(quitOption);
     parser.process(app);
@@ -61,11 +68,23 @@ int main(int argc, char *argv[])
     // The host's side of the module's contracts.
     auto *translatorManager = new TranslatorManager(&app);
     app.setProperty("Orvane.Loomkit.TranslatorManager", QVariant::fromValue<QObject *>(translatorManager));
+    // The network service lives on this thread, so that requests can ask it
+    // for the default configuration directly; it must exist before any
+    // request does.
+    NetworkingPrivate::publish();
+
+    auto *server = new LocalHttpServer(&app);
+    if (parser.isSet(serveOption)) {
+        const QUrl served = server->serve(parser.value(serveOption));
+        std::printf("Serving %s at %s\n", qPrintable(parser.value(serveOption)), qPrintable(served.toString()));
+        std::fflush(stdout);
+    }
 
     QQmlApplicationEngine engine;
 #ifdef LOOMKIT_QML_DIR
     engine.addImportPath(QStringLiteral(LOOMKIT_QML_DIR));
 #endif
+    engine.rootContext()->setContextProperty(QStringLiteral("hostServer"), server);
     for (const QString &folder : parser.values(importOption))
         engine.addImportPath(QDir(folder).absolutePath());
 

@@ -1,0 +1,102 @@
+#include "NetworkProxy.h"
+
+#include <QNetworkProxyFactory>
+#include <QSignalSpy>
+#include <QTest>
+
+class tst_NetworkProxy : public QObject
+{
+    Q_OBJECT
+
+private slots:
+    void init();
+    void urlSetsProxy_data();
+    void urlSetsProxy();
+    void typeTurnsSystemOff();
+    void useSystemProxyUnchangedFiresNothing();
+};
+
+void tst_NetworkProxy::init()
+{
+    // Setting an application proxy drops the system factory: in this order.
+    QNetworkProxy::setApplicationProxy(QNetworkProxy(QNetworkProxy::DefaultProxy));
+    QNetworkProxyFactory::setUseSystemConfiguration(true);
+}
+
+void tst_NetworkProxy::urlSetsProxy_data()
+{
+    QTest::addColumn<QUrl>("url");
+    QTest::addColumn<int>("type");
+    QTest::addColumn<QString>("host");
+    QTest::addColumn<int>("port");
+    QTest::newRow("host and port") << QUrl("http://proxy.example:3128") << int(QNetworkProxy::HttpProxy)
+                                   << "proxy.example" << 3128;
+    QTest::newRow("no port is 65535") << QUrl("http://proxy.example") << int(QNetworkProxy::HttpProxy)
+                                      << "proxy.example" << 65535;
+    QTest::newRow("empty") << QUrl() << int(QNetworkProxy::NoProxy) << "" << 0;
+    QTest::newRow("port 0") << QUrl("http://proxy.example:0") << int(QNetworkProxy::NoProxy) << "" << 0;
+}
+
+void tst_NetworkProxy::urlSetsProxy()
+{
+    QFETCH(QUrl, url);
+    QFETCH(int, type);
+    QFETCH(QString, host);
+    QFETCH(int, port);
+    NetworkProxy proxy;
+    QSignalSpy urlSpy(&proxy, &NetworkProxy::urlChanged);
+    proxy.setUrl(url);
+    QCOMPARE(urlSpy.count(), 1);
+    QVERIFY(!proxy.useSystemProxy());
+    QVERIFY(!QNetworkProxyFactory::usesSystemConfiguration());
+    const QNetworkProxy application = QNetworkProxy::applicationProxy();
+    QCOMPARE(int(application.type()), type);
+    QCOMPARE(int(proxy.type()), type);
+    if (type == QNetworkProxy::HttpProxy) {
+        QCOMPARE(application.hostName(), host);
+        QCOMPARE(int(application.port()), port);
+        QCOMPARE(proxy.url(), QUrl(QStringLiteral("http://%1:%2").arg(host).arg(port)));
+    } else {
+        QVERIFY(proxy.url().isEmpty());
+    }
+}
+
+void tst_NetworkProxy::typeTurnsSystemOff()
+{
+    NetworkProxy proxy;
+    proxy.setUseSystemProxy(false);
+    proxy.setUrl(QUrl("http://proxy.example:8080"));
+    QSignalSpy typeSpy(&proxy, &NetworkProxy::typeChanged);
+    proxy.setType(NetworkProxy::Socks5Proxy);
+    QCOMPARE(typeSpy.count(), 1);
+    QCOMPARE(proxy.type(), NetworkProxy::Socks5Proxy);
+    // The host stays; only an HTTP proxy reads back as a URL.
+    QCOMPARE(QNetworkProxy::applicationProxy().hostName(), QStringLiteral("proxy.example"));
+    QVERIFY(proxy.url().isEmpty());
+}
+
+void tst_NetworkProxy::useSystemProxyUnchangedFiresNothing()
+{
+    NetworkProxy proxy;
+    QSignalSpy systemSpy(&proxy, &NetworkProxy::useSystemProxyChanged);
+    QSignalSpy urlSpy(&proxy, &NetworkProxy::urlChanged);
+    proxy.setUseSystemProxy(true);
+    QCOMPARE(systemSpy.count(), 0);
+    QCOMPARE(urlSpy.count(), 0);
+
+    proxy.setUseSystemProxy(false);
+    QCOMPARE(systemSpy.count(), 1);
+    QCOMPARE(urlSpy.count(), 0);
+
+    // Back to the system: the URL read from the application proxy goes.
+    QNetworkProxy::setApplicationProxy(QNetworkProxy(QNetworkProxy::HttpProxy, "app.example", 1080));
+    QCOMPARE(proxy.url(), QUrl("http://app.example:1080"));
+    proxy.setUseSystemProxy(true);
+    QCOMPARE(systemSpy.count(), 2);
+    QCOMPARE(urlSpy.count(), 1);
+    QVERIFY(proxy.url().isEmpty());
+}
+
+QTEST_MAIN(tst_NetworkProxy)
+
+#include "tst_NetworkProxy.moc"

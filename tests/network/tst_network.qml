@@ -1,0 +1,111 @@
+import QtQuick 2.15
+import QtTest 1.15
+import Orvane.Loomkit 1.0
+
+TestCase {
+    id: testCase
+    name: "NetworkQml"
+
+    Component {
+        id: requestComponent
+        NetworkRequest {}
+    }
+
+    SignalSpy { id: timeoutSpy; signalName: "timeout" }
+
+    function waitDone(request) {
+        tryCompare(request, "readyState", NetworkRequest.ReadyStateComplete, 10000)
+    }
+
+    function echo(request) {
+        return JSON.parse(request.responseText)
+    }
+
+    function test_registration() {
+        verify(Loomkit.network !== null)
+        compare(Loomkit.network.proxy.type !== undefined, true)
+        compare(NetworkRequest.DONE, NetworkRequest.ReadyStateComplete)
+        compare(NetworkRequest.HEADERS_RECEIVED, 2)
+        compare(NetworkRequest.StatusCodeNotFound, 404)
+        compare(NetworkRequest.FollowRedirectsAttribute, 21)
+        compare(NetworkProxy.HttpProxy, 3)
+        compare(Network.ConfigurationStateActive, 14)
+        var set = Qt.createQmlObject("import Orvane.Loomkit 1.0; PropertySet {}", testCase)
+        set.setValue("k", "v")
+        compare(set.replaceVariables("<${k}>"), "<v>")
+        set.destroy()
+        var failed = false
+        try {
+            Qt.createQmlObject("import Orvane.Loomkit 1.0; Network {}", testCase)
+        } catch (e) {
+            failed = e.qmlErrors[0].message === "The Orvane type Network is not creatable"
+        }
+        verify(failed)
+    }
+
+    function test_scriptObjectBodyAndHeaders() {
+        var request = createTemporaryObject(requestComponent, testCase)
+        request.headers.referrer = "http://from.example/"
+        request.headers["X-Custom"] = "custom value"
+        request.open("post", testHttpServer.urlFor("/echo"))
+        compare(request.method, "POST")
+        compare(request.readyState, NetworkRequest.OPENED)
+        request.send({ name: "Ann Lee", age: 42 })
+        waitDone(request)
+        compare(request.status, 200)
+        var sent = echo(request)
+        compare(sent.body, "age=42&name=Ann%20Lee")
+        compare(sent.headers["referer"], "http://from.example/")
+        compare(sent.headers["x-custom"], "custom value")
+        compare(request.headers.referer, "http://from.example/")
+        compare(request.responseHeaders["Content-Type"], "application/json")
+    }
+
+    function test_jsonResponse() {
+        var request = createTemporaryObject(requestComponent, testCase, { responseType: "json" })
+        request.open("GET", testHttpServer.urlFor("/echo?x=1"))
+        request.send()
+        waitDone(request)
+        compare(request.response.method, "GET")
+        compare(request.response.query, "x=1")
+        compare(request.errorCode, 0)
+    }
+
+    function test_timeoutPropertyAndSignal() {
+        var request = createTemporaryObject(requestComponent, testCase)
+        request.timeout = 150
+        compare(request.timeout, 150)
+        timeoutSpy.target = request
+        timeoutSpy.clear()
+        request.open("GET", testHttpServer.urlFor("/hang"))
+        request.send()
+        waitDone(request)
+        compare(timeoutSpy.count, 1)
+        verify(request.errorCode !== 0)
+        verify(request.errorText.length > 0)
+    }
+
+    function test_multipartFromScript() {
+        var request = createTemporaryObject(requestComponent, testCase)
+        request.open("POST", testHttpServer.urlFor("/echo"))
+        request.send({ note: "hello", file: "@" + testDataFolder + "/network/sample.txt;type=text/x-sample" })
+        waitDone(request)
+        var sent = echo(request)
+        verify(sent.multipartWellFormed)
+        compare(sent.parts.length, 2)
+        compare(sent.parts[0].name, "note")
+        compare(sent.parts[1].filename, "sample.txt")
+        compare(sent.parts[1].contentType, "text/x-sample")
+        compare(sent.parts[1].text, "Sample file for upload tests.\n")
+        compare(request.progress, 1.0)
+    }
+
+    function test_attributesFromScript() {
+        var request = createTemporaryObject(requestComponent, testCase)
+        request.open("GET", testHttpServer.urlFor("/status?code=202"))
+        request.send()
+        waitDone(request)
+        compare(request.attribute(NetworkRequest.HttpStatusCodeAttribute, true), 202)
+        compare(request.statusText, "202 Status")
+    }
+}
