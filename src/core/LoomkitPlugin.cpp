@@ -3,6 +3,9 @@
 #include "LoomkitError.h"
 #include "LoomkitLogging.h"
 #include "LoomkitObject.h"
+#include "ZipFileInfo.h"
+#include "ZipReader.h"
+#include "ZipWriter.h"
 
 #include <QCoreApplication>
 #include <QLocale>
@@ -49,6 +52,10 @@ void LoomkitPlugin::registerTypes(const char *uri)
     qmlRegisterSingletonType<Loomkit>(uri, 1, 0, "Loomkit", &LoomkitPlugin::loomkitProvider);
     registerUncreatable<LoomkitObject>(uri, "LoomkitObject", "The Orvane type LoomkitObject is not creatable");
     registerUncreatable<LoomkitError>(uri, "LoomkitError", "The Orvane type LoomkitError is not creatable");
+
+    qmlRegisterType<ZipReader>(uri, 1, 0, "ZipReader");
+    qmlRegisterType<ZipWriter>(uri, 1, 0, "ZipWriter");
+    qmlRegisterType<ZipFileInfo>(uri, 1, 0, "ZipFileInfo");
 }
 
 void LoomkitPlugin::initializeNetwork()
