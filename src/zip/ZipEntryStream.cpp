@@ -36,10 +36,12 @@ QDateTime ZipEntryStream::dateTime(const tm_unz &date)
 
 bool ZipEntryStream::openOutput(QFile &file, const QString &path, bool noFollow)
 {
-    if (!noFollow)
+    if (!noFollow) {
+        file.setFileName(path);
         return file.open(QIODevice::WriteOnly | QIODevice::Truncate | QIODevice::Unbuffered);
+    }
 
-    int flags = O_WRONLY | O_CREAT | O_TRUNC | O_CLOEXEC | O_NOFOLLOW;
+    const int flags = O_WRONLY | O_CREAT | O_TRUNC | O_CLOEXEC | O_NOFOLLOW;
     const QByteArray native = QFile::encodeName(path);
     int fd;
     do {

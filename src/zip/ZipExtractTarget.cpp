@@ -117,6 +117,11 @@ bool ZipExtractTarget::makeFolder(const QString &folder, bool *refused)
         return false;
     }
 
+    // What exists must be a folder (through a link that stays inside).
+    struct stat target;
+    if (::stat(QFile::encodeName(resolved).constData(), &target) != 0 || !S_ISDIR(target.st_mode))
+        return false;
+
     QString path = existing;
     for (const QString &part : qAsConst(missing)) {
         path += QLatin1Char('/') + part;

@@ -418,19 +418,37 @@ QByteArray ZipReader::readFile()
         qCCritical(lcFile) << Q_FUNC_INFO << "unzGetCurrentFileInfo64" << result;
         return QByteArray();
     }
-    if (info.uncompressed_size > MaxReadSize) {
-        qCCritical(lcFile) << Q_FUNC_INFO << "Entry too large to read into memory:" << entryName(raw) << "Size:"
-                           << info.uncompressed_size;
-        unzCloseCurrentFile(m_zipFile);
-        return QByteArray();
+    // Read by chunks rather than trusting the declared size: a header can
+    // claim far more than the entry holds (Debian's minizip also leaves the
+    // Zip64 marker 0xffffffff in place of a size it does not parse).
+    const ZPOS64_T declared = info.uncompressed_size;
+    QByteArray data;
+    data.reserve(int(qMin<ZPOS64_T>(declared, ZipEntryStream::ChunkSize)));
+    qint64 total = 0;
+    for (;;) {
+        const qint64 room = qMin<qint64>(qint64(MaxReadSize) - total, ZipEntryStream::ChunkSize);
+        if (room <= 0) {
+            qCCritical(lcFile) << Q_FUNC_INFO << "Entry too large to read into memory:" << entryName(raw)
+                               << "Size:" << declared;
+            unzCloseCurrentFile(m_zipFile);
+            return QByteArray();
+        }
+        data.resize(int(total + room));
+        result = unzReadCurrentFile(m_zipFile, data.data() + total, unsigned(room));
+        if (result < 0) {
+            qCCritical(lcFile) << Q_FUNC_INFO << "unzReadCurrentFile error:" << result << "Extracting:"
+                               << entryName(raw) << "Size:" << declared;
+            unzCloseCurrentFile(m_zipFile);
+            return QByteArray();
+        }
+        total += result;
+        if (result == 0)
+            break;
     }
-    QByteArray data(int(info.uncompressed_size), '\0');
-    result = unzReadCurrentFile(m_zipFile, data.data(), unsigned(data.size()));
     unzCloseCurrentFile(m_zipFile);
-    if (result < 0) {
-        qCCritical(lcFile) << Q_FUNC_INFO << "unzReadCurrentFile error:" << result << "Extracting:" << entryName(raw)
-                           << "Size:" << info.uncompressed_size;
-        return QByteArray();
-    }
+    data.resize(int(total));
+    // A short entry still gives an array of the declared size.
+    if (declared <= MaxReadSize && ZPOS64_T(total) < declared)
+        data.append(QByteArray(int(declared - ZPOS64_T(total)), '\0'));
     return data;
 }
