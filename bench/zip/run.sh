@@ -22,13 +22,15 @@ fi
 BYTES=$(du -sb --apparent-size "$WORK/tree" | cut -f1)
 FILES=$(find "$WORK/tree" -type f | wc -l)
 
-# measure NAME COMMAND...: runs once, records seconds and peak RSS (KiB).
+# measure NAME COMMAND...: runs it, records wall seconds, CPU seconds (user +
+# system) and peak RSS (KiB). On a shared machine the CPU time is the
+# steadier figure.
 measure() {
     name=$1; shift
     sync
-    $TIME -f "%e %M" -o "$WORK/$name.time" "$@"
+    $TIME -f "%e %U %S %M" -o "$WORK/$name.time" "$@"
     set -- $(cat "$WORK/$name.time")
-    eval "${name}_s=$1 ${name}_kb=$2"
+    eval "${name}_s=$1 ${name}_cpu=$(awk -v u="$2" -v s="$3" 'BEGIN { printf "%.2f", u + s }') ${name}_kb=$4"
 }
 rate() { awk -v b="$BYTES" -v s="$1" 'BEGIN { printf "%.1f", b / 1e6 / s }'; }
 ratio() { awk -v a="$1" -v b="$2" 'BEGIN { printf "%.2f", b / a }'; }
@@ -44,16 +46,17 @@ measure reader "$BENCH" extract "$WORK/ref.zip" "$WORK/out-reader"
 diff -rq "$WORK/tree" "$WORK/out-reader" >/dev/null || { echo "extracted tree differs"; exit 1; }
 
 echo "data: $FILES files, $(awk -v b="$BYTES" 'BEGIN { printf "%.1f", b / 1e6 }') MB; archive $(du -m "$WORK/ref.zip" | cut -f1) MB (zip), $(du -m "$WORK/ours.zip" | cut -f1) MB (ZipWriter)"
-printf '%-28s %8s %9s %12s\n' "" "seconds" "MB/s" "peak RSS MB"
+printf '%-28s %7s %9s %7s %9s %12s\n' "" "wall s" "MB/s" "CPU s" "MB/CPU s" "peak RSS MB"
 for n in reader unzip writer zip; do
-    eval "s=\$${n}_s kb=\$${n}_kb"
+    eval "s=\$${n}_s cpu=\$${n}_cpu kb=\$${n}_kb"
     case $n in
         reader) label="ZipReader.extractAll" ;;
         unzip) label="unzip -o -q" ;;
         writer) label="ZipWriter.addFile (level 6)" ;;
         zip) label="zip -q -r (level 6)" ;;
     esac
-    printf '%-28s %8s %9s %12s\n' "$label" "$s" "$(rate "$s")" "$(awk -v k="$kb" 'BEGIN { printf "%.1f", k / 1024 }')"
+    printf '%-28s %7s %9s %7s %9s %12s\n' "$label" "$s" "$(rate "$s")" "$cpu" "$(rate "$cpu")" \
+        "$(awk -v k="$kb" 'BEGIN { printf "%.1f", k / 1024 }')"
 done
-echo "extraction speed ZipReader/unzip: $(ratio "$reader_s" "$unzip_s")x"
-echo "writing speed ZipWriter/zip:      $(ratio "$writer_s" "$zip_s")x"
+echo "extraction ZipReader vs unzip: $(ratio "$reader_s" "$unzip_s")x wall, $(ratio "$reader_cpu" "$unzip_cpu")x CPU"
+echo "writing    ZipWriter vs zip:   $(ratio "$writer_s" "$zip_s")x wall, $(ratio "$writer_cpu" "$zip_cpu")x CPU"
