@@ -298,11 +298,11 @@ bool ZipReader::extractCurrentFile(QString outputFile)
         qCCritical(lcFile) << Q_FUNC_INFO << "unzGetCurrentFileInfo64" << result;
         return false;
     }
-    return extractEntry(entryName(raw), info, outputFile, false);
+    return extractEntry(entryName(raw), info, outputFile, outputFile, false);
 }
 
 bool ZipReader::extractEntry(const QString &name, const unz_file_info64 &info, const QString &outputFile,
-                             bool noFollow)
+                             const QString &shownFile, bool noFollow)
 {
     int result = unzOpenCurrentFile(m_zipFile);
     if (result != UNZ_OK) {
@@ -315,7 +315,7 @@ bool ZipReader::extractEntry(const QString &name, const unz_file_info64 &info, c
         unzCloseCurrentFile(m_zipFile);
         if (noFollow && isLink(outputFile)) {
             qCCritical(lcFile) << Q_FUNC_INFO << "Refusing to write through a link:" << name << "->" << outputFile;
-            emit error(name, outputFile, ParameterError);
+            emit error(name, shownFile, ParameterError);
         } else {
             qCCritical(lcFile) << Q_FUNC_INFO << "Error opening:" << outputFile;
         }
@@ -324,13 +324,13 @@ bool ZipReader::extractEntry(const QString &name, const unz_file_info64 &info, c
 
     const double total = double(info.uncompressed_size);
     result = ZipEntryStream::copyCurrent(m_zipFile, file, m_buffer, [&](qint64 count) {
-        emit progress(name, outputFile, double(count) / total * 100.0);
+        emit progress(name, shownFile, double(count) / total * 100.0);
     });
     if (result < 0) {
         qCCritical(lcFile) << Q_FUNC_INFO << "unzReadCurrentFile error:" << result << "Extracting:" << name
                            << " to " << outputFile << "Buffer size:" << m_bufferSize;
         unzCloseCurrentFile(m_zipFile);
-        emit error(name, outputFile, Result(result));
+        emit error(name, shownFile, Result(result));
         return false;
     }
 
@@ -341,10 +341,10 @@ bool ZipReader::extractEntry(const QString &name, const unz_file_info64 &info, c
     FileUtility::setDateTime(outputFile, modified, modified);
     if (closed == UNZ_CRCERROR) {
         qCCritical(lcFile) << Q_FUNC_INFO << "Checksum mismatch:" << name << "->" << outputFile;
-        emit error(name, outputFile, CrcError);
+        emit error(name, shownFile, CrcError);
         return false;
     }
-    emit progress(name, outputFile, 100.0);
+    emit progress(name, shownFile, 100.0);
     return true;
 }
 
@@ -395,7 +395,7 @@ bool ZipReader::extractAll(QDir &dir, const QString &basePath)
                 continue;
             }
             if (!isFolder)
-                extractEntry(current, info, safeTarget, true);
+                extractEntry(current, info, safeTarget, target, true);
         } while (gotoNextFile());
     }
 

@@ -87,9 +87,10 @@ private:
     QStringList names(int flags);
     int locateSensitivity() const;
 
-    // One entry's extraction, given its name and record already read.
+    // One entry's extraction, given its name and record already read. The
+    // file is written at outputFile; signals carry shownFile.
     bool extractEntry(const QString &name, const unz_file_info64 &info, const QString &outputFile,
-                      bool noFollow);
+                      const QString &shownFile, bool noFollow);
 
     QString m_path;
     unzFile m_zipFile = nullptr;

@@ -355,6 +355,17 @@ void tst_ZipReader::extractAll()
     QCOMPARE(recorder.events.count(QStringLiteral("completed")), 1);
     QCOMPARE(recorder.events.last(), QStringLiteral("completed"));
     QVERIFY(recorder.errorOutputs.isEmpty());
+
+    // Signals name the output as the output folder and the entry make it,
+    // relative when the folder is.
+    const QString previous = QDir::currentPath();
+    QVERIFY(QDir::setCurrent(out.path()));
+    QSignalSpy progress(&reader, &ZipReader::progress);
+    QVERIFY(reader.extractAll(QStringLiteral("relative")));
+    QDir::setCurrent(previous);
+    QVERIFY(!progress.isEmpty());
+    QCOMPARE(progress.last().at(1).toString(), QStringLiteral("relative/") + progress.last().at(0).toString());
+    QVERIFY(QFileInfo::exists(out.filePath(QStringLiteral("relative/a/deep/c/d.txt"))));
 }
 
 void tst_ZipReader::extractAllBasePath_data()
