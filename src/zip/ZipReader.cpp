@@ -19,8 +19,9 @@ namespace {
 constexpr int CaseSensitiveCompare = 1;
 constexpr int CaseInsensitiveCompare = 2;
 
-// readFile holds a whole entry in one array; refuse what cannot be sensible.
-constexpr ZPOS64_T MaxReadSize = ZPOS64_T(1) << 30;
+// readFile holds a whole entry in memory, and script turns it into text:
+// refuse what cannot be sensible.
+constexpr ZPOS64_T MaxReadSize = ZPOS64_T(256) << 20;
 
 QString entryName(const QByteArray &raw)
 {
@@ -421,12 +422,14 @@ QByteArray ZipReader::readFile()
     // Read by chunks rather than trusting the declared size: a header can
     // claim far more than the entry holds (Debian's minizip also leaves the
     // Zip64 marker 0xffffffff in place of a size it does not parse).
+    // The first chunk is one byte more than declared, so that an honest
+    // entry is read in one call and its end seen in the next.
     const ZPOS64_T declared = info.uncompressed_size;
     QByteArray data;
-    data.reserve(int(qMin<ZPOS64_T>(declared, ZipEntryStream::ChunkSize)));
     qint64 total = 0;
-    for (;;) {
-        const qint64 room = qMin<qint64>(qint64(MaxReadSize) - total, ZipEntryStream::ChunkSize);
+    qint64 chunk = qint64(qMin<ZPOS64_T>(declared + 1, ZipEntryStream::ChunkSize));
+    for (;; chunk = ZipEntryStream::ChunkSize) {
+        const qint64 room = qMin<qint64>(qint64(MaxReadSize) - total, chunk);
         if (room <= 0) {
             qCCritical(lcFile) << Q_FUNC_INFO << "Entry too large to read into memory:" << entryName(raw)
                                << "Size:" << declared;
@@ -446,9 +449,8 @@ QByteArray ZipReader::readFile()
             break;
     }
     unzCloseCurrentFile(m_zipFile);
+    // A damaged entry that holds less than it declares gives what it holds:
+    // padding it to the declared size would let a header ask for memory.
     data.resize(int(total));
-    // A short entry still gives an array of the declared size.
-    if (declared <= MaxReadSize && ZPOS64_T(total) < declared)
-        data.append(QByteArray(int(declared - ZPOS64_T(total)), '\0'));
     return data;
 }

@@ -21,6 +21,7 @@ struct Entry
     bool deflate = false;
     bool badCrc = false;
     bool damage = false;             // garble the stored bytes after the first few
+    qint64 declaredSize = -1;        // uncompressed size to claim, if not the real one
     quint32 externalAttributes = 0; // high 16 bits: Unix mode
     quint16 versionMadeBy = 20;      // high byte 3: Unix
     quint16 dosTime = 0x5000;        // 10:00:00
@@ -98,7 +99,8 @@ inline QByteArray build(const QList<Entry> &entries)
         put16(out, entry.dosDate);
         put32(out, crc);
         put32(out, quint32(stored.size()));
-        put32(out, quint32(entry.data.size()));
+        const quint32 size = quint32(entry.declaredSize < 0 ? entry.data.size() : entry.declaredSize);
+        put32(out, size);
         put16(out, quint16(entry.name.size()));
         put16(out, 0);
         out.append(entry.name);
@@ -113,7 +115,7 @@ inline QByteArray build(const QList<Entry> &entries)
         put16(central, entry.dosDate);
         put32(central, crc);
         put32(central, quint32(stored.size()));
-        put32(central, quint32(entry.data.size()));
+        put32(central, size);
         put16(central, quint16(entry.name.size()));
         put16(central, 0);
         put16(central, 0);

@@ -80,6 +80,9 @@ private slots:
     void linkEntriesStayFiles();
     void longNames_data();
     void longNames();
+    void oversizedClaims_data();
+    void oversizedClaims();
+    void fuzzFindings();
 
 private:
     QString archiveOf(const QList<Entry> &entries);
@@ -752,6 +755,54 @@ void tst_ZipReader::longNames()
     QTemporaryDir out;
     QVERIFY(reader.extractAll(out.path()));
     QCOMPARE(ZipTestTree::readAll(out.filePath(QStringLiteral("short.txt"))), QByteArray("short"));
+}
+
+void tst_ZipReader::oversizedClaims_data()
+{
+    QTest::addColumn<qint64>("declared");
+    QTest::addColumn<QString>("expected");
+    QTest::newRow("honest") << qint64(5) << QStringLiteral("short");
+    QTest::newRow("claims less") << qint64(1) << QStringLiteral("s");
+    QTest::newRow("claims 256 MiB") << qint64(256) * 1024 * 1024 << QStringLiteral("short");
+    QTest::newRow("claims 1 GiB") << qint64(1) * 1024 * 1024 * 1024 << QStringLiteral("short");
+    QTest::newRow("claims 4 GiB less one") << qint64(0xffffffff) << QStringLiteral("short");
+}
+
+void tst_ZipReader::oversizedClaims()
+{
+    QFETCH(qint64, declared);
+    QFETCH(QString, expected);
+
+    // Reading stops at the data the entry holds, whatever the header
+    // claims, so a few bytes never ask for gigabytes.
+    Entry entry = ZipTestArchive::file("claim.txt", "short", true);
+    entry.declaredSize = declared;
+    ZipReader reader;
+    reader.setPath(archiveOf({entry}));
+    QCOMPARE(reader.readTextFile(QStringLiteral("claim.txt")), expected);
+    QTemporaryDir out;
+    QVERIFY(reader.extractAll(out.path()));
+    QCOMPARE(QString::fromUtf8(ZipTestTree::readAll(out.filePath(QStringLiteral("claim.txt")))), expected);
+}
+
+void tst_ZipReader::fuzzFindings()
+{
+    // Inputs the fuzzer once found trouble with, run the way it runs them.
+    QDir findings(TestSupport::dataPath(QStringLiteral("zip/fuzz")));
+    const QStringList files = findings.entryList(QDir::Files);
+    QVERIFY(!files.isEmpty());
+    for (const QString &file : files) {
+        ZipReader reader;
+        reader.setPath(findings.filePath(file));
+        const QStringList names = reader.fileNames();
+        reader.folderNames();
+        if (!names.isEmpty()) {
+            QVERIFY(reader.readTextFile(names.first()).size() < 4096 * 1100);
+        }
+        QTemporaryDir out;
+        QVERIFY(reader.extractAll(out.filePath(QStringLiteral("x"))));
+        QVERIFY(ZipTestTree::listTree(out.path()).size() <= names.size() + 10);
+    }
 }
 
 QTEST_GUILESS_MAIN(tst_ZipReader)
