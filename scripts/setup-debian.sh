@@ -11,7 +11,7 @@ PACKAGES="
  qml-module-qt-labs-folderlistmodel
  qt5-image-formats-plugins
  zlib1g-dev libminizip-dev
- zip unzip libimage-exiftool-perl exiv2
+ zip unzip time libimage-exiftool-perl exiv2
  python3 python3-xmltodict curl openssl rsyslog
  clang libclang-rt-14-dev
 "

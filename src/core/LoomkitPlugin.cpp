@@ -10,6 +10,9 @@
 #include "NetworkRequest.h"
 #include "NetworkRequestHeaders.h"
 #include "PropertySet.h"
+#include "ZipFileInfo.h"
+#include "ZipReader.h"
+#include "ZipWriter.h"
 
 #include <QCoreApplication>
 #include <QLocale>
@@ -64,6 +67,10 @@ void LoomkitPlugin::registerTypes(const char *uri)
     qmlRegisterType<AuthenticationChallenge>(uri, 1, 0, "AuthenticationChallenge");
     // row 38
     qmlRegisterType<PropertySet>(uri, 1, 0, "PropertySet");
+
+    qmlRegisterType<ZipReader>(uri, 1, 0, "ZipReader");
+    qmlRegisterType<ZipWriter>(uri, 1, 0, "ZipWriter");
+    qmlRegisterType<ZipFileInfo>(uri, 1, 0, "ZipFileInfo");
 }
 
 void LoomkitPlugin::initializeNetwork()
