@@ -1,6 +1,7 @@
 #include "Loomkit.h"
 #include "FileUtility.h"
 #include "LoomkitLogging.h"
+#include "XmlUtility.h"
 #include "platform/AppUtilsPrivate.h"
 
 #include <QClipboard>
@@ -737,4 +738,16 @@ bool Loomkit::isAppInstalled(const QStringList &appIdentifierValues)
             return true;
     }
     return false;
+}
+
+// Text data parsers
+
+QVariantMap Loomkit::xmlToJson(const QString &xml, const QVariantMap &options)
+{
+    return XmlUtility::toVariantMap(xml, options);
+}
+
+QVariantMap Loomkit::xmlToJson(const QString &xml)
+{
+    return XmlUtility::toVariantMap(xml, QVariantMap());
 }
