@@ -130,7 +130,7 @@ bool Scanner::run(const QString &xml, QString *reason)
 const QChar *Scanner::scanDoctype(const QChar *p, const QChar *end)
 {
     char16_t quote = 0;
-    for (; p != end; ++p) {
+    while (p != end) {
         const char16_t c = p->unicode();
         if (quote) {
             if (c == quote)
@@ -139,11 +139,11 @@ const QChar *Scanner::scanDoctype(const QChar *p, const QChar *end)
             quote = c;
         } else if (c == '[') {
             p = scanSubset(p + 1, end, 0);
-            if (p == end)
-                return end;
+            continue;
         } else if (c == '>') {
             return p + 1;
         }
+        ++p;
     }
     return end;
 }
