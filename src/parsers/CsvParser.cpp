@@ -544,7 +544,17 @@ bool CsvParser::readField(FieldValues &fields)
 {
     int line;
     int column;
-    const int ch = readChar(line, column);
+    int ch;
+    if (m_pushBackSize == 0 && m_pos != m_end && m_pos->unicode() != m_textQualifier.unicode()) {
+        // Reading the first character only to put it back would leave the
+        // same state behind once the plain field has read it; it stays.
+        QVariant value;
+        if (!readPlainField(value))
+            return false;
+        fields.append(std::move(value));
+        return true;
+    }
+    ch = readChar(line, column);
     if (ch == m_textQualifier.unicode() && ch != kEnd) {
         QString text;
         if (!readQuotedField(text))
@@ -630,8 +640,71 @@ bool CsvParser::readPlainField(QVariant &value)
     return true;
 }
 
+// A quoted field that ends well inside the buffer is measured first and
+// copied once, doubled qualifiers and all; anything else takes the loop.
+bool CsvParser::readQuotedFieldInBuffer(QString &text)
+{
+    const char16_t delimiter = m_delimiter.unicode();
+    const char16_t qualifier = m_textQualifier.unicode();
+    if (m_pushBackSize != 0)
+        return false;
+    const QChar *begin = m_pos;
+    const QChar *q = begin;
+    int doubled = 0;
+    int lineNumber = m_line;
+    int columnNumber = m_column;
+    for (;;) {
+        while (q != m_end && q->unicode() != qualifier) {
+            if (q->unicode() == kLineFeed) {
+                ++lineNumber;
+                columnNumber = 1;
+            } else {
+                ++columnNumber;
+            }
+            ++q;
+        }
+        if (q == m_end || q + 1 == m_end)
+            return false;
+        const char16_t next = q[1].unicode();
+        if (next == qualifier) {
+            ++doubled;
+            columnNumber += 2;
+            q += 2;
+            continue;
+        }
+        if (next != delimiter && next != kLineFeed && next != kCarriageReturn)
+            return false;
+        break;
+    }
+
+    const int size = int(q - begin) - doubled;
+    if (doubled == 0) {
+        text = size == 0 ? QString(QLatin1String("")) : QString(begin, size);
+    } else {
+        text = QString(size, Qt::Uninitialized);
+        QChar *out = text.data();
+        for (const QChar *p = begin; p != q; ++p) {
+            *out++ = *p;
+            if (p->unicode() == qualifier)
+                ++p;
+        }
+    }
+    // The closing qualifier is read, and the character after it is read and
+    // put back, as the loop would.
+    m_pos = q + 1;
+    m_line = lineNumber;
+    m_column = columnNumber + 1;
+    int line;
+    int column;
+    const int ch = readChar(line, column);
+    pushBack(ch, line, column);
+    return true;
+}
+
 bool CsvParser::readQuotedField(QString &text)
 {
+    if (readQuotedFieldInBuffer(text))
+        return true;
     const char16_t delimiter = m_delimiter.unicode();
     const char16_t qualifier = m_textQualifier.unicode();
     for (;;) {
@@ -770,17 +843,29 @@ QVariant CsvParser::plainValue(const QChar *begin, int size, bool isNull) const
 
 // Turning a local date-time into an instant costs a time zone lookup in the
 // C library, far more than the rest of a field; columns of dates repeat, so
-// a small direct-mapped cache remembers the latest text of each slot.
+// a two-way cache remembers recent texts. Keys live in the slots themselves,
+// so a look-up touches one cache line.
 QDateTime CsvParser::isoDateTime(const QChar *begin, int size) const
 {
+    if (size > DateTimeSlot::kMaximumText)
+        return QDateTime::fromString(QString(begin, size), Qt::ISODate);
     uint hash = 2166136261u;
     for (int i = 0; i < size; ++i)
         hash = (hash ^ begin[i].unicode()) * 16777619u;
-    DateTimeSlot &slot = m_dateTimeSlots[hash & (kDateTimeSlots - 1)];
-    if (slot.text.size() == size && std::equal(begin, begin + size, slot.text.constData()))
-        return slot.dateTime;
-    slot.text = QString(begin, size);
-    slot.dateTime = QDateTime::fromString(slot.text, Qt::ISODate);
+    const uint index = (hash ^ (hash >> 15)) & (kDateTimeSlots - 2);
+    DateTimeSlot *pair = m_dateTimeSlots.get() + index;
+    for (int way = 0; way < 2; ++way) {
+        DateTimeSlot &slot = pair[way];
+        if (slot.size == size && std::equal(begin, begin + size, slot.text)) {
+            slot.age = ++m_dateTimeClock;
+            return slot.dateTime;
+        }
+    }
+    DateTimeSlot &slot = pair[0].age <= pair[1].age ? pair[0] : pair[1];
+    std::copy(begin, begin + size, slot.text);
+    slot.size = size;
+    slot.age = ++m_dateTimeClock;
+    slot.dateTime = QDateTime::fromString(QString(begin, size), Qt::ISODate);
     return slot.dateTime;
 }
 

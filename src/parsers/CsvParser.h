@@ -103,6 +103,7 @@ private:
     bool readField(FieldValues &fields);
     bool readPlainField(QVariant &value);
     bool readQuotedField(QString &text);
+    bool readQuotedFieldInBuffer(QString &text);
     bool readLineEnd();
     QVariant plainValue(const QChar *begin, int size, bool isNull) const;
     QDateTime isoDateTime(const QChar *begin, int size) const;
@@ -144,11 +145,16 @@ private:
     bool m_hasFixedFields = false;
     bool m_autoType = true;
     QString m_dateTimeFormat;
-    struct DateTimeSlot
+    // One cache line each.
+    struct alignas(64) DateTimeSlot
     {
-        QString text;
+        static constexpr int kMaximumText = 24;
+        QChar text[kMaximumText];
+        int size = -1;
+        quint32 age = 0;
         QDateTime dateTime;
     };
+    mutable quint32 m_dateTimeClock = 0;
     static constexpr int kDateTimeSlots = 1 << 15;
     std::unique_ptr<DateTimeSlot[]> m_dateTimeSlots;
     QLocale m_locale = QLocale::c();

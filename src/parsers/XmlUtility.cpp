@@ -55,10 +55,26 @@ private:
     bool m_split = false;
 };
 
+// A key's values; the list is made only when a second value comes, as most
+// keys have one.
 struct Group
 {
     QString key;
+    QVariant first;
     QVariantList values;
+    int count = 0;
+
+    void add(QVariant value)
+    {
+        if (count == 0) {
+            first = std::move(value);
+        } else {
+            if (count == 1)
+                values.append(std::move(first));
+            values.append(std::move(value));
+        }
+        ++count;
+    }
 };
 
 // Values of one element's children under their keys, and the order in
@@ -73,17 +89,17 @@ public:
     {
         const int groupIndex = find(key);
         Group &group = m_groups[groupIndex];
-        m_order.append(qMakePair(groupIndex, group.values.size()));
-        group.values.append(std::move(value));
+        m_order.append(qMakePair(groupIndex, group.count));
+        group.add(std::move(value));
     }
 
     void storeInto(QVariantMap &result, const QString &nodesProperty, const IndexFormat &format)
     {
         for (Group &group : m_groups) {
-            if (group.values.size() == 1)
-                result.insert(group.key, group.values.first());
+            if (group.count == 1)
+                result.insert(group.key, std::move(group.first));
             else
-                result.insert(group.key, group.values);
+                result.insert(group.key, std::move(group.values));
         }
         if (m_order.isEmpty() || nodesProperty.isEmpty())
             return;
@@ -91,7 +107,7 @@ public:
         nodes.reserve(m_order.size());
         for (const auto &entry : qAsConst(m_order)) {
             const Group &group = m_groups.at(entry.first);
-            nodes.append(group.values.size() == 1 ? group.key : format.entry(group.key, entry.second));
+            nodes.append(group.count == 1 ? group.key : format.entry(group.key, entry.second));
         }
         result.insert(nodesProperty, nodes);
     }
@@ -107,7 +123,7 @@ private:
                     return i;
             }
             if (m_groups.size() < 16) {
-                m_groups.append(Group { key, {} });
+                m_groups.append(Group { key, {}, {}, 0 });
                 return m_groups.size() - 1;
             }
             for (int i = 0; i < m_groups.size(); ++i)
@@ -117,7 +133,7 @@ private:
         if (it != m_index.constEnd())
             return it.value();
         m_index.insert(key, m_groups.size());
-        m_groups.append(Group { key, {} });
+        m_groups.append(Group { key, {}, {}, 0 });
         return m_groups.size() - 1;
     }
 

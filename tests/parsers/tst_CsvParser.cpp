@@ -11,6 +11,7 @@
 #include <QTextCodec>
 #include <QtTest>
 
+#include <cmath>
 #include <cstring>
 
 namespace {
