@@ -291,7 +291,9 @@ bool CsvParser::parse()
         m_headers.clear();
     m_line = 1;
     m_column = 1;
-    m_dateTimeSlots.reset(new DateTimeSlot[kDateTimeSlots]);
+    m_dateTimeSlots.reset();
+    m_dateTimeSlotCount = 0;
+    m_dateTimeMisses = 0;
 
     if (!m_hasFixedFields && !readHeaderRow()) {
         close();
@@ -852,7 +854,13 @@ QDateTime CsvParser::isoDateTime(const QChar *begin, int size) const
     uint hash = 2166136261u;
     for (int i = 0; i < size; ++i)
         hash = (hash ^ begin[i].unicode()) * 16777619u;
-    const uint index = (hash ^ (hash >> 15)) & (kDateTimeSlots - 2);
+    // Small at first; a column of many distinct dates makes it grow.
+    if (m_dateTimeMisses >= m_dateTimeSlotCount && m_dateTimeSlotCount < kMaximumDateTimeSlots) {
+        m_dateTimeSlotCount = m_dateTimeSlotCount == 0 ? 256 : m_dateTimeSlotCount * 8;
+        m_dateTimeSlots.reset(new DateTimeSlot[m_dateTimeSlotCount]);
+        m_dateTimeMisses = 0;
+    }
+    const uint index = (hash ^ (hash >> 15)) & uint(m_dateTimeSlotCount - 2);
     DateTimeSlot *pair = m_dateTimeSlots.get() + index;
     for (int way = 0; way < 2; ++way) {
         DateTimeSlot &slot = pair[way];
@@ -861,6 +869,7 @@ QDateTime CsvParser::isoDateTime(const QChar *begin, int size) const
             return slot.dateTime;
         }
     }
+    ++m_dateTimeMisses;
     DateTimeSlot &slot = pair[0].age <= pair[1].age ? pair[0] : pair[1];
     std::copy(begin, begin + size, slot.text);
     slot.size = size;

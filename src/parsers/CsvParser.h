@@ -155,8 +155,10 @@ private:
         QDateTime dateTime;
     };
     mutable quint32 m_dateTimeClock = 0;
-    static constexpr int kDateTimeSlots = 1 << 15;
-    std::unique_ptr<DateTimeSlot[]> m_dateTimeSlots;
+    static constexpr int kMaximumDateTimeSlots = 1 << 15;
+    mutable std::unique_ptr<DateTimeSlot[]> m_dateTimeSlots;
+    mutable int m_dateTimeSlotCount = 0;
+    mutable int m_dateTimeMisses = 0;
     QLocale m_locale = QLocale::c();
     bool m_cLocale = true;
 };

@@ -21,7 +21,7 @@ Panel {
         Fact { name: "book[0].price"; value: result.book[0].price["#text"] + " " + result.book[0].price["@currency"] }
         Fact { name: "book[1].title"; value: result.book[1].title }
         Fact { name: "#comment"; value: result["#comment"] }
-        Fact { name: "#cdata of note"; value: result.note["#cdata"] }
+        Fact { name: "#cdata of note"; value: result.note["#cdata"].replace(/</g, "&lt;").replace(/>/g, "&gt;") }
         Fact { name: "#nodes"; value: result["#nodes"].join(", ") }
         Fact { name: "@version"; value: result["@version"] }
         Fact { name: "Too deep (1500 levels)"; value: Object.keys(Loomkit.xmlToJson("<a>".repeat(1500) + "</a>".repeat(1500))).length + " keys" }
