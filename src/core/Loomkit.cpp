@@ -2,6 +2,7 @@
 #include "FileUtility.h"
 #include "LoomkitLogging.h"
 #include "Network.h"
+#include "XmlUtility.h"
 #include "platform/AppUtilsPrivate.h"
 
 #include <QClipboard>
@@ -781,4 +782,16 @@ bool Loomkit::isAppInstalled(const QStringList &appIdentifierValues)
             return true;
     }
     return false;
+}
+
+// Text data parsers
+
+QVariantMap Loomkit::xmlToJson(const QString &xml, const QVariantMap &options)
+{
+    return XmlUtility::toVariantMap(xml, options);
+}
+
+QVariantMap Loomkit::xmlToJson(const QString &xml)
+{
+    return XmlUtility::toVariantMap(xml, QVariantMap());
 }

@@ -120,6 +120,10 @@ public:
     Q_INVOKABLE bool isAppInstalled(const QString &appIdentifier);
     Q_INVOKABLE bool isAppInstalled(const QStringList &appIdentifierValues);
 
+    // Text data parsers
+    Q_INVOKABLE QVariantMap xmlToJson(const QString &xml, const QVariantMap &options);
+    Q_INVOKABLE QVariantMap xmlToJson(const QString &xml);
+
 signals:
     void userHomePathChanged();
     void offlineStoragePathChanged();
