@@ -4,7 +4,6 @@
 
 #include <QDir>
 #include <QFile>
-#include <QGuiApplication>
 #include <QSignalSpy>
 #include <QTemporaryDir>
 #include <QtTest>
@@ -320,5 +319,5 @@ void tst_FileInfo::overriddenSetterThroughProperty()
     QCOMPARE(info.fileName(), QStringLiteral("x.jpg"));
 }
 
-QTEST_MAIN(tst_FileInfo)
+QTEST_GUILESS_MAIN(tst_FileInfo)
 #include "tst_FileInfo.moc"
