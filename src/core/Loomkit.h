@@ -16,6 +16,11 @@ class QQuickItem;
 class QQuickWindow;
 class QImage;
 class AppUtilsPrivate;
+class BinaryData;
+class LocaleInfo;
+class Settings;
+class UrlInfo;
+class VersionNumber;
 
 // The module's one QML singleton, shared by every engine of the process.
 class Loomkit : public QObject
@@ -42,6 +47,9 @@ class Loomkit : public QObject
     Q_PROPERTY(QString defaultLocale READ defaultLocale WRITE setDefaultLocale NOTIFY defaultLocaleChanged)
     Q_PROPERTY(QStringList availableLocaleNames READ availableLocaleNames CONSTANT)
     Q_PROPERTY(QString systemLocale READ systemLocale CONSTANT)
+
+    // Settings, binary data and value objects
+    Q_PROPERTY(Settings *settings READ settings CONSTANT)
 
 public:
     explicit Loomkit(QObject *parent = nullptr);
@@ -110,6 +118,20 @@ public:
     Q_INVOKABLE bool isAppInstalled(const QString &appIdentifier);
     Q_INVOKABLE bool isAppInstalled(const QStringList &appIdentifierValues);
 
+    // Settings, binary data and value objects
+    Settings *settings();
+    Q_INVOKABLE BinaryData *binaryData(const QJSValue &value);
+    Q_INVOKABLE BinaryData *binaryData();
+    Q_INVOKABLE UrlInfo *urlInfo(const QUrl &url);
+    Q_INVOKABLE QVariant uuid();
+    Q_INVOKABLE QVariant uuid(const QString &uuid);
+    Q_INVOKABLE QVariant uuid(const QByteArray &rfc4122);
+    Q_INVOKABLE LocaleInfo *localeInfo(const QJSValue &locale);
+    Q_INVOKABLE LocaleInfo *localeInfo();
+    Q_INVOKABLE VersionNumber *versionNumber(int major, int minor, int micro);
+    Q_INVOKABLE VersionNumber *versionNumber(const QString &versionString);
+    Q_INVOKABLE int compareVersionNumber(const QVariant &version1, const QVariant &version2);
+
 signals:
     void userHomePathChanged();
     void offlineStoragePathChanged();
@@ -130,6 +152,7 @@ private:
 
     QDir m_userHome;
     double m_displayScaleFactor = 0;
+    Settings *m_settings = nullptr;
     QStringList m_availableLocaleNames;
     AppUtilsPrivate *m_appUtils = nullptr;
 };

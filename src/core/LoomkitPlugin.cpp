@@ -4,6 +4,17 @@
 #include "LoomkitLogging.h"
 #include "LoomkitObject.h"
 
+#include "BinaryData.h"
+#include "CryptographicHash.h"
+#include "InputValidator.h"
+#include "LocaleInfo.h"
+#include "MessageAuthenticationCode.h"
+#include "Settings.h"
+#include "SettingsBase.h"
+#include "UrlInfo.h"
+#include "Uuid.h"
+#include "VersionNumber.h"
+
 #include <QCoreApplication>
 #include <QLocale>
 #include <QNetworkProxyFactory>
@@ -49,6 +60,18 @@ void LoomkitPlugin::registerTypes(const char *uri)
     qmlRegisterSingletonType<Loomkit>(uri, 1, 0, "Loomkit", &LoomkitPlugin::loomkitProvider);
     registerUncreatable<LoomkitObject>(uri, "LoomkitObject", "The Orvane type LoomkitObject is not creatable");
     registerUncreatable<LoomkitError>(uri, "LoomkitError", "The Orvane type LoomkitError is not creatable");
+
+    // Rows of the data and settings area, each at its place in the table.
+    registerUncreatable<SettingsBase>(uri, "Settings", "The Orvane type Settings is not creatable");      // 12
+    qmlRegisterType<CryptographicHash>(uri, 1, 0, "CryptographicHash");                                   // 17
+    qmlRegisterType<MessageAuthenticationCode>(uri, 1, 0, "MessageAuthenticationCode");                   // 18
+    qmlRegisterType<UrlInfo>(uri, 1, 0, "UrlInfo");                                                       // 23
+    qmlRegisterType<LocaleInfo>(uri, 1, 0, "LocaleInfo");                                                 // 24
+    qmlRegisterType<Settings>(uri, 1, 0, "Settings");                                                     // 28
+    qmlRegisterType<BinaryData>(uri, 1, 0, "BinaryData");                                                 // 39
+    qmlRegisterType<InputValidator>(uri, 1, 0, "InputValidator");                                         // 41
+    qmlRegisterType<VersionNumber>(uri, 1, 0, "VersionNumber");                                           // 42
+    Uuid::registerMetaType();
 }
 
 void LoomkitPlugin::initializeNetwork()
