@@ -8,6 +8,13 @@
 #include "StandardPaths.h"
 #include "platform/AppUtilsPrivate.h"
 
+#include "BinaryData.h"
+#include "LocaleInfo.h"
+#include "Settings.h"
+#include "UrlInfo.h"
+#include "Uuid.h"
+#include "VersionNumber.h"
+
 #include <QClipboard>
 #include <QCoreApplication>
 #include <QGeoCoordinate>
@@ -811,4 +818,74 @@ FileInfo *Loomkit::fileInfo(const QString &path)
 FileInfo *Loomkit::fileInfo(const QUrl &pathUrl)
 {
     return scriptOwned(new FileInfo(pathUrl));
+}
+
+// Settings, binary data and value objects
+
+Settings *Loomkit::settings()
+{
+    if (!m_settings)
+        m_settings = new Settings(this);
+    return m_settings;
+}
+
+BinaryData *Loomkit::binaryData(const QJSValue &value)
+{
+    return BinaryData::create(value, BinaryData::TextEncodingUtf8);
+}
+
+BinaryData *Loomkit::binaryData()
+{
+    return binaryData(QJSValue(QJSValue::UndefinedValue));
+}
+
+UrlInfo *Loomkit::urlInfo(const QUrl &url)
+{
+    return UrlInfo::create(url);
+}
+
+QVariant Loomkit::uuid()
+{
+    return Uuid::createUuid().toVariant();
+}
+
+QVariant Loomkit::uuid(const QString &uuid)
+{
+    return Uuid::fromString(uuid).toVariant();
+}
+
+QVariant Loomkit::uuid(const QByteArray &rfc4122)
+{
+    return Uuid::fromRfc4122(rfc4122).toVariant();
+}
+
+LocaleInfo *Loomkit::localeInfo(const QJSValue &locale)
+{
+    if (locale.isNull() || locale.isUndefined())
+        return LocaleInfo::create(QLocale());
+    // A Qt.locale() object reads "[object Object]" as text; its name is meant.
+    const QJSValue name = locale.isObject() ? locale.property(QStringLiteral("name")) : QJSValue();
+    return LocaleInfo::create(QLocale(name.isString() ? name.toString() : locale.toString()));
+}
+
+LocaleInfo *Loomkit::localeInfo()
+{
+    return localeInfo(QJSValue(QJSValue::UndefinedValue));
+}
+
+VersionNumber *Loomkit::versionNumber(int major, int minor, int micro)
+{
+    return VersionNumber::create(QVersionNumber(major, minor, micro));
+}
+
+VersionNumber *Loomkit::versionNumber(const QString &versionString)
+{
+    VersionNumber *version = VersionNumber::create(QVersionNumber());
+    version->setVersionString(versionString);
+    return version;
+}
+
+int Loomkit::compareVersionNumber(const QVariant &version1, const QVariant &version2)
+{
+    return QVersionNumber::compare(VersionNumber::toVersion(version1), VersionNumber::toVersion(version2));
 }

@@ -22,6 +22,11 @@ class QQuickItem;
 class QQuickWindow;
 class QImage;
 class AppUtilsPrivate;
+class BinaryData;
+class LocaleInfo;
+class Settings;
+class UrlInfo;
+class VersionNumber;
 
 // The module's one QML singleton, shared by every engine of the process.
 class Loomkit : public QObject
@@ -54,6 +59,9 @@ class Loomkit : public QObject
     Q_PROPERTY(FileFolder *temporaryFolder READ temporaryFolder CONSTANT)
     Q_PROPERTY(StandardPaths *standardPaths READ standardPaths CONSTANT)
     Q_PROPERTY(Environment *environment READ environment CONSTANT)
+
+    // Settings, binary data and value objects
+    Q_PROPERTY(Settings *settings READ settings CONSTANT)
 
 public:
     explicit Loomkit(QObject *parent = nullptr);
@@ -134,6 +142,20 @@ public:
     Q_INVOKABLE FileInfo *fileInfo(const QString &path);
     Q_INVOKABLE FileInfo *fileInfo(const QUrl &pathUrl);
 
+    // Settings, binary data and value objects
+    Settings *settings();
+    Q_INVOKABLE BinaryData *binaryData(const QJSValue &value);
+    Q_INVOKABLE BinaryData *binaryData();
+    Q_INVOKABLE UrlInfo *urlInfo(const QUrl &url);
+    Q_INVOKABLE QVariant uuid();
+    Q_INVOKABLE QVariant uuid(const QString &uuid);
+    Q_INVOKABLE QVariant uuid(const QByteArray &rfc4122);
+    Q_INVOKABLE LocaleInfo *localeInfo(const QJSValue &locale);
+    Q_INVOKABLE LocaleInfo *localeInfo();
+    Q_INVOKABLE VersionNumber *versionNumber(int major, int minor, int micro);
+    Q_INVOKABLE VersionNumber *versionNumber(const QString &versionString);
+    Q_INVOKABLE int compareVersionNumber(const QVariant &version1, const QVariant &version2);
+
 signals:
     void userHomePathChanged();
     void offlineStoragePathChanged();
@@ -154,6 +176,7 @@ private:
 
     QDir m_userHome;
     double m_displayScaleFactor = 0;
+    Settings *m_settings = nullptr;
     QStringList m_availableLocaleNames;
     AppUtilsPrivate *m_appUtils = nullptr;
     Environment *m_environment = nullptr;

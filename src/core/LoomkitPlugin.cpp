@@ -10,6 +10,17 @@
 #include "StandardPaths.h"
 #include "StorageInfo.h"
 
+#include "BinaryData.h"
+#include "CryptographicHash.h"
+#include "InputValidator.h"
+#include "LocaleInfo.h"
+#include "MessageAuthenticationCode.h"
+#include "Settings.h"
+#include "SettingsBase.h"
+#include "UrlInfo.h"
+#include "Uuid.h"
+#include "VersionNumber.h"
+
 #include <QCoreApplication>
 #include <QLocale>
 #include <QNetworkProxyFactory>
@@ -55,13 +66,24 @@ void LoomkitPlugin::registerTypes(const char *uri)
     qmlRegisterSingletonType<Loomkit>(uri, 1, 0, "Loomkit", &LoomkitPlugin::loomkitProvider);
     registerUncreatable<LoomkitObject>(uri, "LoomkitObject", "The Orvane type LoomkitObject is not creatable");
     registerUncreatable<LoomkitError>(uri, "LoomkitError", "The Orvane type LoomkitError is not creatable");
-    registerUncreatable<Environment>(uri, "Environment", "The Orvane type Environment is not creatable");
-    qmlRegisterType<File>(uri, 1, 0, "File");
-    qmlRegisterType<FileInfo>(uri, 1, 0, "FileInfo");
-    qmlRegisterType<FileFolder>(uri, 1, 0, "FileFolder");
-    qmlRegisterType<StorageInfo>(uri, 1, 0, "StorageInfo");
-    registerUncreatable<StandardPaths>(uri, "StandardPaths", "The Orvane type StandardPaths is not creatable");
-    qRegisterMetaType<StorageInfo::StorageType>("StorageInfo::StorageType");
+    // Rows of the data, settings, files and storage areas, each at its place in the table.
+    registerUncreatable<Environment>(uri, "Environment", "The Orvane type Environment is not creatable");    // 6
+    registerUncreatable<SettingsBase>(uri, "Settings", "The Orvane type Settings is not creatable");      // 12
+    qmlRegisterType<CryptographicHash>(uri, 1, 0, "CryptographicHash");                                   // 17
+    qmlRegisterType<MessageAuthenticationCode>(uri, 1, 0, "MessageAuthenticationCode");                   // 18
+    qmlRegisterType<UrlInfo>(uri, 1, 0, "UrlInfo");                                                       // 23
+    qmlRegisterType<LocaleInfo>(uri, 1, 0, "LocaleInfo");                                                 // 24
+    qmlRegisterType<File>(uri, 1, 0, "File");                                                             // 25
+    qmlRegisterType<FileInfo>(uri, 1, 0, "FileInfo");                                                     // 26
+    qmlRegisterType<FileFolder>(uri, 1, 0, "FileFolder");                                                 // 27
+    qmlRegisterType<Settings>(uri, 1, 0, "Settings");                                                     // 28
+    qmlRegisterType<StorageInfo>(uri, 1, 0, "StorageInfo");                                               // 31
+    registerUncreatable<StandardPaths>(uri, "StandardPaths", "The Orvane type StandardPaths is not creatable"); // 35
+    qRegisterMetaType<StorageInfo::StorageType>("StorageInfo::StorageType");                              // 36
+    qmlRegisterType<BinaryData>(uri, 1, 0, "BinaryData");                                                 // 39
+    qmlRegisterType<InputValidator>(uri, 1, 0, "InputValidator");                                         // 41
+    qmlRegisterType<VersionNumber>(uri, 1, 0, "VersionNumber");                                           // 42
+    Uuid::registerMetaType();
 }
 
 void LoomkitPlugin::initializeNetwork()
