@@ -5,6 +5,7 @@
 #include "FileUtility.h"
 #include "JsonUtility.h"
 #include "LoomkitLogging.h"
+#include "Settings.h"
 
 #include <QDirIterator>
 #include <QFile>
@@ -738,6 +739,14 @@ bool FileFolder::writeTextFile(const QString &fileName, const QString &text)
     if (!checkReadOnly(Q_FUNC_INFO))
         return false;
     return writeFileData(m_dir.filePath(fileName), text.toUtf8());
+}
+
+Settings *FileFolder::settingsFile(const QString &fileName)
+{
+    const QString name = fileName.isEmpty() ? QStringLiteral("settings.ini") : fileName;
+    auto *settings = new Settings(m_dir.filePath(name), QSettings::IniFormat);
+    QQmlEngine::setObjectOwnership(settings, QQmlEngine::JavaScriptOwnership);
+    return settings;
 }
 
 void FileFolder::refresh()

@@ -13,6 +13,7 @@
 class File;
 class FileInfo;
 class QIODevice;
+class Settings;
 
 // QML's handle on one folder: listing, making and removing folders, reading
 // and writing whole files, and moving files to the trash.
@@ -97,6 +98,7 @@ public:
     Q_INVOKABLE bool writeJsonFile(const QString &fileName, const QVariantMap &json);
     Q_INVOKABLE QString readTextFile(const QString &fileName);
     Q_INVOKABLE bool writeTextFile(const QString &fileName, const QString &text);
+    Q_INVOKABLE Settings *settingsFile(const QString &fileName);
 
     Q_INVOKABLE void refresh();
     Q_INVOKABLE QVariant moveFileToTrash(const QString &fileName);

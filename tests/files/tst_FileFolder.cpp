@@ -3,6 +3,7 @@
 #include "FileFolderWorker.h"
 #include "FileInfo.h"
 #include "JsonUtility.h"
+#include "Settings.h"
 
 #include <QBuffer>
 #include <QDir>
@@ -72,6 +73,8 @@ private slots:
     void writeFromDevice();
     void textAndJson();
     void renameFile();
+    void settingsFile_data();
+    void settingsFile();
     void fileHelpers();
     void factories();
     void trash();
@@ -606,6 +609,37 @@ void tst_FileFolder::renameFile()
 
     QTest::ignoreMessage(QtWarningMsg, QRegularExpression(QStringLiteral("oldFileName:")));
     QVERIFY(!folder.renameFile(QStringLiteral("none.txt"), QStringLiteral("d.txt")));
+}
+
+void tst_FileFolder::settingsFile_data()
+{
+    QTest::addColumn<QString>("name");
+    QTest::addColumn<QString>("expected");
+    QTest::newRow("default name") << "" << "settings.ini";
+    QTest::newRow("own name") << "app.conf" << "app.conf";
+    QTest::newRow("in a sub-folder") << "sub/x.ini" << "sub/x.ini";
+}
+
+void tst_FileFolder::settingsFile()
+{
+    QFETCH(QString, name);
+    QFETCH(QString, expected);
+
+    FileFolder folder(m_dir->path());
+    {
+        QScopedPointer<Settings> settings(folder.settingsFile(name));
+        QVERIFY(!settings->parent());
+        QCOMPARE(QQmlEngine::objectOwnership(settings.data()), QQmlEngine::JavaScriptOwnership);
+        QCOMPARE(settings->path(), path(expected));
+        QCOMPARE(settings->format(), QSettings::IniFormat);
+        settings->setValue(QStringLiteral("group/key"), QStringLiteral("value"));
+        settings->synchronize();
+        QCOMPARE(settings->status(), QSettings::NoError);
+    }
+    // Written as INI text, and read back by a fresh store.
+    QVERIFY(contents(path(expected)).contains("[group]"));
+    QScopedPointer<Settings> again(folder.settingsFile(name));
+    QCOMPARE(again->value(QStringLiteral("group/key")).toString(), QStringLiteral("value"));
 }
 
 void tst_FileFolder::fileHelpers()
