@@ -12,6 +12,7 @@
 #include <QFileInfo>
 #include <QJSValue>
 #include <QQmlEngine>
+#include <QStandardPaths>
 #include <QThread>
 
 namespace {
@@ -116,6 +117,24 @@ void collectNames(const Listing &listing, const QString &folderPath, const QStri
         collectNames(listing, entry.filePath(), name + QDir::separator(), chain, result);
         chain->removeLast();
     }
+}
+
+// QFile::moveToTrash falls back to the current working folder when the
+// home trash can't be made. Make sure it can (a fresh account may have no
+// data folder yet), so that a file never lands anywhere else.
+bool homeTrashUsable()
+{
+    const QString dataHome = QStandardPaths::writableLocation(QStandardPaths::GenericDataLocation);
+    if (dataHome.isEmpty())
+        return false;
+    if (!QFileInfo::exists(dataHome)) {
+        if (!QDir().mkpath(dataHome))
+            return false;
+        QFile::setPermissions(dataHome, QFileDevice::ReadOwner | QFileDevice::WriteOwner | QFileDevice::ExeOwner);
+    }
+    const QFileInfo dataInfo(dataHome);
+    const QFileInfo trashInfo(dataHome + QLatin1String("/Trash"));
+    return dataInfo.isDir() && dataInfo.isWritable() && (!trashInfo.exists() || trashInfo.isDir());
 }
 
 } // namespace
@@ -767,18 +786,26 @@ QVariant FileFolder::moveFileToTrash(const QString &fileName)
 
     if (!QFileInfo::exists(path) && !QFileInfo(path).isSymLink()) {
         qCDebug(lcFile) << Q_FUNC_INFO << "File does not exist..." << path;
-        emit movedFileToTrash(fileName, QVariant(), QStringLiteral("File does not exist."));
+        notifyMovedFileToTrash(fileName, QVariant(), QStringLiteral("File does not exist."));
         return QVariant();
     }
 
     QString pathInTrash;
-    if (!QFile::moveToTrash(path, &pathInTrash)) {
+    if (!homeTrashUsable() || !QFile::moveToTrash(path, &pathInTrash)) {
         qCWarning(lcFile) << Q_FUNC_INFO << "Unable to move file to trash:" << path;
-        emit movedFileToTrash(fileName, QVariant(), QStringLiteral("Unable to move file to trash."));
+        notifyMovedFileToTrash(fileName, QVariant(), QStringLiteral("Unable to move file to trash."));
         return QVariant();
     }
-    emit movedFileToTrash(fileName, pathInTrash, QString());
+    notifyMovedFileToTrash(fileName, pathInTrash, QString());
     return pathInTrash;
+}
+
+void FileFolder::notifyMovedFileToTrash(const QString &originalFile, const QVariant &pathInTrash,
+                                        const QString &error)
+{
+    emit movedFileToTrash(originalFile);
+    emit movedFileToTrash(originalFile, pathInTrash);
+    emit movedFileToTrash(originalFile, pathInTrash, error);
 }
 
 void FileFolder::moveFileToTrashAsync(const QString &fileName)

@@ -111,8 +111,11 @@ signals:
     void pathChanged();
     void existsChanged();
     void sizeChanged();
-    void movedFileToTrash(const QString &originalFile, const QVariant &pathInTrash = QVariant(),
-                          const QString &error = QString());
+    // Three overloads rather than default arguments: QML takes the one
+    // declared last, and must see all three arguments. Each is emitted.
+    void movedFileToTrash(const QString &originalFile);
+    void movedFileToTrash(const QString &originalFile, const QVariant &pathInTrash);
+    void movedFileToTrash(const QString &originalFile, const QVariant &pathInTrash, const QString &error);
 
 private slots:
     void onPathChanged();
@@ -123,6 +126,7 @@ private:
     bool checkConstant(const char *function) const;
     bool checkReadOnly(const char *function) const;
     QStringList entryNames(const QVariant &nameFilter, bool subFolders, QDir::Filters filters) const;
+    void notifyMovedFileToTrash(const QString &originalFile, const QVariant &pathInTrash, const QString &error);
     bool writeDevice(const QString &filePath, QIODevice *device) const;
     static bool copyFolder(const QString &source, const QString &target, QStringList *chain);
 

@@ -46,6 +46,8 @@ QString native(const QString &path)
     return QDir::toNativeSeparators(path);
 }
 
+const auto kMovedFileToTrash = qOverload<const QString &, const QVariant &, const QString &>(&FileFolder::movedFileToTrash);
+
 } // namespace
 
 class tst_FileFolder : public QObject
@@ -78,6 +80,8 @@ private slots:
     void fileHelpers();
     void factories();
     void trash();
+    void trashWithoutDataFolder();
+    void trashUnusable();
     void trashAsync();
     void trashAsyncFolderGone();
     void worker();
@@ -696,11 +700,16 @@ void tst_FileFolder::trash()
     qputenv("XDG_DATA_HOME", QFile::encodeName(data.path()));
 
     FileFolder folder(m_dir->path());
-    QSignalSpy spy(&folder, &FileFolder::movedFileToTrash);
+    QSignalSpy spy(&folder, kMovedFileToTrash);
+    QSignalSpy oneArgument(&folder, SIGNAL(movedFileToTrash(QString)));
+    QSignalSpy twoArguments(&folder, SIGNAL(movedFileToTrash(QString,QVariant)));
 
     QVariant result = folder.moveFileToTrash(QStringLiteral("missing.txt"));
     QVERIFY(!result.isValid());
     QCOMPARE(spy.count(), 1);
+    QCOMPARE(oneArgument.count(), 1);
+    QCOMPARE(twoArguments.count(), 1);
+    QCOMPARE(oneArgument.at(0).at(0).toString(), QStringLiteral("missing.txt"));
     QCOMPARE(spy.at(0).at(0).toString(), QStringLiteral("missing.txt"));
     QVERIFY(!spy.at(0).at(1).isValid());
     QCOMPARE(spy.at(0).at(2).toString(), QStringLiteral("File does not exist."));
@@ -730,6 +739,50 @@ void tst_FileFolder::trash()
     QCOMPARE(spy.last().at(0).toString(), url);
 }
 
+void tst_FileFolder::trashWithoutDataFolder()
+{
+    // A fresh account may have no data folder yet.
+    QTemporaryDir base;
+    QVERIFY(base.isValid());
+    const QString dataHome = base.filePath(QStringLiteral("not/yet"));
+    qputenv("XDG_DATA_HOME", QFile::encodeName(dataHome));
+    QVERIFY(writeBytes(path(QStringLiteral("t.txt")), "t"));
+
+    FileFolder folder(m_dir->path());
+    const QVariant result = folder.moveFileToTrash(QStringLiteral("t.txt"));
+    QVERIFY(result.toString().startsWith(dataHome + QStringLiteral("/Trash/files/")));
+    QCOMPARE(contents(result.toString()), QByteArray("t"));
+    QCOMPARE(QFileInfo(dataHome).permissions() & 0x7777, QFileDevice::Permissions(0x7000 | 0x0700) & 0x7777);
+}
+
+void tst_FileFolder::trashUnusable()
+{
+    // The data folder can't be made: a file stands in its way.
+    QTemporaryDir base;
+    QVERIFY(base.isValid());
+    QVERIFY(writeBytes(base.filePath(QStringLiteral("blocker")), "b"));
+    qputenv("XDG_DATA_HOME", QFile::encodeName(base.filePath(QStringLiteral("blocker/data"))));
+    QVERIFY(writeBytes(path(QStringLiteral("stays.txt")), "stays"));
+
+    QTemporaryDir work;
+    QVERIFY(work.isValid());
+    const QString previous = QDir::currentPath();
+    QVERIFY(QDir::setCurrent(work.path()));
+
+    FileFolder folder(m_dir->path());
+    QSignalSpy spy(&folder, kMovedFileToTrash);
+    QTest::ignoreMessage(QtWarningMsg, QRegularExpression(QStringLiteral("Unable to move file to trash")));
+    const QVariant result = folder.moveFileToTrash(QStringLiteral("stays.txt"));
+    QDir::setCurrent(previous);
+
+    QVERIFY(!result.isValid());
+    QCOMPARE(spy.count(), 1);
+    QCOMPARE(spy.at(0).at(2).toString(), QStringLiteral("Unable to move file to trash."));
+    QCOMPARE(contents(path(QStringLiteral("stays.txt"))), QByteArray("stays"));
+    // Nothing was put in the working folder instead.
+    QVERIFY(QDir(work.path()).entryList(QDir::AllEntries | QDir::NoDotAndDotDot).isEmpty());
+}
+
 void tst_FileFolder::trashAsync()
 {
     QTemporaryDir data;
@@ -739,8 +792,8 @@ void tst_FileFolder::trashAsync()
 
     FileFolder folder(m_dir->path());
     QThread *signalThread = nullptr;
-    connect(&folder, &FileFolder::movedFileToTrash, this, [&] { signalThread = QThread::currentThread(); });
-    QSignalSpy spy(&folder, &FileFolder::movedFileToTrash);
+    connect(&folder, kMovedFileToTrash, this, [&] { signalThread = QThread::currentThread(); });
+    QSignalSpy spy(&folder, kMovedFileToTrash);
 
     folder.moveFileToTrashAsync(QStringLiteral("async.txt"));
     QVERIFY(spy.wait(5000));
