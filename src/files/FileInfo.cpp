@@ -51,6 +51,8 @@ void FileInfo::setFilePath(const QString &path)
     qCInfo(lcFile) << Q_FUNC_INFO << "filePath: " << path;
     setFileInfo(FileUtility::resolvedPath(path, true));
     emit filePathChanged();
+    // Another file has other permissions; bindings on them must follow.
+    emit permissionsChanged();
 }
 
 QUrl FileInfo::url() const

@@ -172,9 +172,11 @@ void tst_FileInfo::pathForms()
 
     FileInfo set;
     QSignalSpy spy(&set, &FileInfo::filePathChanged);
+    QSignalSpy permissionSpy(&set, &FileInfo::permissionsChanged);
     set.setFilePath(given);
     QCOMPARE(set.filePath(), expected);
     QCOMPARE(spy.count(), 1);
+    QCOMPARE(permissionSpy.count(), 1);
 }
 
 void tst_FileInfo::urlSetter()
