@@ -227,37 +227,58 @@ bool File::reset()
     return true;
 }
 
+bool File::appendRawLine(int *size)
+{
+    // Reads into a buffer kept between calls: a fresh array for each line
+    // would cost more than the reading itself.
+    const int start = *size;
+    for (;;) {
+        if (m_lineBuffer.size() - *size < 2)
+            m_lineBuffer.resize(qMax(4096, m_lineBuffer.size() * 2));
+        const qint64 count = m_file.readLine(m_lineBuffer.data() + *size, m_lineBuffer.size() - *size);
+        if (count <= 0)
+            break;
+        *size += int(count);
+        if (m_lineBuffer.at(*size - 1) == '\n')
+            break;
+    }
+    return *size > start;
+}
+
 QString File::readLine()
 {
     if (!checkOpen(Q_FUNC_INFO))
         return QString();
 
-    QByteArray line = m_file.readLine();
+    int size = 0;
+    appendRawLine(&size);
     if (m_textEncoding == TextEncodingUtf16) {
         // A line feed byte ends a UTF-16 line only as half of the unit 0x000A
         // at a unit boundary; otherwise it belongs to another character.
         const bool littleEndian = QSysInfo::ByteOrder == QSysInfo::LittleEndian;
-        for (;;) {
-            if (!line.endsWith('\n'))
-                break;
-            const bool lowHalf = line.size() % 2 == 1;
+        while (size > 0 && m_lineBuffer.at(size - 1) == '\n') {
+            const bool lowHalf = size % 2 == 1;
             if (littleEndian && lowHalf) {
                 char next = 0;
                 if (!m_file.getChar(&next))
                     break;
-                line.append(next);
+                if (m_lineBuffer.size() - size < 2)
+                    m_lineBuffer.resize(m_lineBuffer.size() * 2);
+                m_lineBuffer[size++] = next;
                 if (next == 0)
                     break;
-            } else if (!littleEndian && !lowHalf && line.size() >= 2 && line.at(line.size() - 2) == 0) {
+            } else if (!littleEndian && !lowHalf && size >= 2 && m_lineBuffer.at(size - 2) == 0) {
                 break;
             }
-            const QByteArray more = m_file.readLine();
-            if (more.isEmpty())
+            if (!appendRawLine(&size))
                 break;
-            line.append(more);
         }
     }
-    const QString text = StringUtility::toString(line, moduleEncoding(m_textEncoding));
+    const QString text = StringUtility::toString(QByteArray::fromRawData(m_lineBuffer.constData(), size),
+                                                 moduleEncoding(m_textEncoding));
+    // Long lines are rare; don't keep a large buffer for them.
+    if (m_lineBuffer.size() > 1 << 20)
+        m_lineBuffer = QByteArray();
     emit positionChanged();
     return text;
 }

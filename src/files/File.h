@@ -121,10 +121,12 @@ private:
     void connectSignals();
     bool checkOpen(const char *function) const;
     void writeBytes(const QByteArray &bytes);
+    bool appendRawLine(int *size);
 
     QFile m_file;
     QString m_path;
     TextEncoding m_textEncoding = TextEncodingUtf8;
+    QByteArray m_lineBuffer;
 };
 
 #endif // FILE_H

@@ -15,6 +15,12 @@
 #include <QStandardPaths>
 #include <QThread>
 
+#include <cerrno>
+#include <cstring>
+#include <fcntl.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
 namespace {
 
 // Hidden files count towards the size; symbolic links don't.
@@ -135,6 +141,80 @@ bool homeTrashUsable()
     const QFileInfo dataInfo(dataHome);
     const QFileInfo trashInfo(dataHome + QLatin1String("/Trash"));
     return dataInfo.isDir() && dataInfo.isWritable() && (!trashInfo.exists() || trashInfo.isDir());
+}
+
+bool writeAll(int fd, const char *data, qint64 size)
+{
+    while (size > 0) {
+        const ssize_t written = ::write(fd, data, size_t(size));
+        if (written < 0) {
+            if (errno == EINTR)
+                continue;
+            return false;
+        }
+        data += written;
+        size -= written;
+    }
+    return true;
+}
+
+bool copyContents(int in, int out)
+{
+    // In the kernel where it can; some file systems share the blocks. Where
+    // it can't, the plain loop goes on from the same offsets.
+    for (;;) {
+        const ssize_t copied = ::copy_file_range(in, nullptr, out, nullptr, 1 << 30, 0);
+        if (copied == 0)
+            return true;
+        if (copied > 0)
+            continue;
+        if (errno == EINTR)
+            continue;
+        if (errno == EXDEV || errno == ENOSYS || errno == EINVAL || errno == EOPNOTSUPP || errno == EBADF)
+            break;
+        return false;
+    }
+    QByteArray buffer(1 << 20, Qt::Uninitialized);
+    for (;;) {
+        const ssize_t count = ::read(in, buffer.data(), size_t(buffer.size()));
+        if (count == 0)
+            return true;
+        if (count < 0) {
+            if (errno == EINTR)
+                continue;
+            return false;
+        }
+        if (!writeAll(out, buffer.constData(), count))
+            return false;
+    }
+}
+
+// Copies a regular file to a new one. The test for an existing target and
+// the creation are one step, so nothing in the target's place is ever
+// overwritten, not even a dangling link. The copy gets the source's mode; a
+// failed copy leaves no partial file behind.
+bool copyRegularFile(const QString &source, const QString &target, QString *error)
+{
+    QFile in(source);
+    if (!in.open(QIODevice::ReadOnly | QIODevice::Unbuffered)) {
+        *error = in.errorString();
+        return false;
+    }
+    QFile out(target);
+    if (!out.open(QIODevice::WriteOnly | QIODevice::NewOnly | QIODevice::Unbuffered)) {
+        *error = out.errorString();
+        return false;
+    }
+    struct stat status;
+    bool copied = ::fstat(in.handle(), &status) == 0 && copyContents(in.handle(), out.handle());
+    if (copied)
+        copied = ::fchmod(out.handle(), status.st_mode & 07777) == 0;
+    if (!copied)
+        *error = QString::fromLocal8Bit(::strerror(errno));
+    out.close();
+    if (!copied)
+        out.remove();
+    return copied;
 }
 
 } // namespace
@@ -499,6 +579,11 @@ bool FileFolder::copyFile(const QString &fileName, const QString &filePath)
         qCCritical(lcFile) << Q_FUNC_INFO << "File is not readable:" << source;
         return false;
     }
+    // A fifo or a device would block or never end.
+    if (!sourceInfo.isDir() && !sourceInfo.isFile()) {
+        qCCritical(lcFile) << Q_FUNC_INFO << "File is not a regular file:" << source;
+        return false;
+    }
 
     QString target = FileUtility::resolvedPath(filePath, true);
     if (sourceInfo.isDir()) {
@@ -517,8 +602,9 @@ bool FileFolder::copyFile(const QString &fileName, const QString &filePath)
         qCCritical(lcFile) << Q_FUNC_INFO << "Target file already exists:" << target;
         return false;
     }
-    if (!QFile::copy(source, target)) {
-        qCWarning(lcFile) << Q_FUNC_INFO << "Copy failed:" << source << "->" << target;
+    QString error;
+    if (!copyRegularFile(source, target, &error)) {
+        qCWarning(lcFile) << Q_FUNC_INFO << "Copy failed:" << source << "->" << target << error;
         return false;
     }
     return true;
@@ -534,8 +620,9 @@ bool FileFolder::copyFolder(const QString &source, const QString &target, QStrin
             qCWarning(lcFile) << Q_FUNC_INFO << "Skipping what is not a regular file:" << source;
             return true;
         }
-        if (!QFile::copy(source, target)) {
-            qCWarning(lcFile) << Q_FUNC_INFO << "copyFile failed:" << source << "->" << target;
+        QString error;
+        if (!copyRegularFile(source, target, &error)) {
+            qCWarning(lcFile) << Q_FUNC_INFO << "copyFile failed:" << source << "->" << target << error;
             return false;
         }
         return true;

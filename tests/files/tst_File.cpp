@@ -29,6 +29,8 @@ private slots:
     void initTestCase();
     void lines_data();
     void lines();
+    void lastLineWithoutEnding_data();
+    void lastLineWithoutEnding();
     void openAndClose();
     void openFailure();
     void pathWhileOpen();
@@ -65,6 +67,11 @@ void tst_File::lines_data()
                             << QByteArray("\xe9\nb\n");
     QTest::newRow("local 8-bit") << int(File::TextEncodingLocal8Bit) << QStringList { "plain" }
                                  << QByteArray("plain\n");
+    const QString longLine = QString(70000, QChar(0x0A0A)) + QString::fromUtf8("é");
+    QTest::newRow("utf8 long line") << int(File::TextEncodingUtf8) << QStringList { longLine, "b", longLine }
+                                    << (longLine + "\nb\n" + longLine + "\n").toUtf8();
+    QTest::newRow("utf16 long line") << int(File::TextEncodingUtf16) << QStringList { longLine, longLine }
+                                     << utf16Bytes(longLine + "\n" + longLine + "\n");
     QTest::newRow("utf16") << int(File::TextEncodingUtf16) << QStringList { "ab", "c" }
                            << utf16Bytes(QStringLiteral("ab\nc\n"));
     // U+0A0A and U+0D0A hold the line feed byte inside one character.
@@ -98,6 +105,42 @@ void tst_File::lines()
         QCOMPARE(file.readLine(), line + QLatin1Char('\n'));
     QVERIFY(file.atEnd());
     QVERIFY(file.readLine().isEmpty());
+}
+
+void tst_File::lastLineWithoutEnding_data()
+{
+    QTest::addColumn<int>("encoding");
+    QTest::addColumn<QByteArray>("bytes");
+    QTest::addColumn<QStringList>("lines");
+
+    QTest::newRow("utf8") << int(File::TextEncodingUtf8) << QByteArray("a\nlast") << QStringList { "a\n", "last" };
+    QTest::newRow("utf16") << int(File::TextEncodingUtf16) << utf16Bytes(QStringLiteral("a\nlast"))
+                           << QStringList { "a\n", "last" };
+    // An odd byte at the end of UTF-16 text is half a character: dropped.
+    QTest::newRow("utf16 odd tail") << int(File::TextEncodingUtf16) << utf16Bytes(QStringLiteral("ab")) + "\n"
+                                    << QStringList { "ab" };
+}
+
+void tst_File::lastLineWithoutEnding()
+{
+    QFETCH(int, encoding);
+    QFETCH(QByteArray, bytes);
+    QFETCH(QStringList, lines);
+
+    const QString name = path(QStringLiteral("tail-%1.txt").arg(QTest::currentDataTag()));
+    {
+        QFile raw(name);
+        QVERIFY(raw.open(QIODevice::WriteOnly));
+        raw.write(bytes);
+    }
+    File file(name);
+    file.setTextEncoding(File::TextEncoding(encoding));
+    QVERIFY(file.open(File::OpenModeReadOnly));
+    QStringList read;
+    while (!file.atEnd())
+        read << file.readLine();
+    QCOMPARE(read, lines);
+    QCOMPARE(file.position(), qlonglong(bytes.size()));
 }
 
 void tst_File::openAndClose()

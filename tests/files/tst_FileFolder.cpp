@@ -399,6 +399,18 @@ void tst_FileFolder::copyFile()
     QVERIFY(!folder.copyFile(QStringLiteral("one.txt"), path(QStringLiteral("missing/folder/x.txt"))));
     QVERIFY(!QFileInfo::exists(path(QStringLiteral("missing"))));
 
+    // The copy keeps the mode; a fifo is no file to copy.
+    QVERIFY(writeBytes(path(QStringLiteral("src/tool.sh")), "#!/bin/sh\n"));
+    QVERIFY(::chmod(QFile::encodeName(path(QStringLiteral("src/tool.sh"))).constData(), 0750) == 0);
+    QVERIFY(folder.copyFile(QStringLiteral("tool.sh"), path(QStringLiteral("dst"))));
+    struct stat status;
+    QVERIFY(::stat(QFile::encodeName(path(QStringLiteral("dst/tool.sh"))).constData(), &status) == 0);
+    QCOMPARE(int(status.st_mode & 07777), 0750);
+    QVERIFY(::mkfifo(QFile::encodeName(path(QStringLiteral("src/pipe"))).constData(), 0600) == 0);
+    QTest::ignoreMessage(QtCriticalMsg, QRegularExpression(QStringLiteral("File is not a regular file:.*pipe")));
+    QVERIFY(!folder.copyFile(QStringLiteral("pipe"), path(QStringLiteral("dst"))));
+    QVERIFY(!QFileInfo::exists(path(QStringLiteral("dst/pipe"))));
+
     // The target goes through path resolution.
     QVERIFY(folder.copyFile(QStringLiteral("one.txt"), QStringLiteral("$TEMP/") + QFileInfo(path(QStringLiteral("via-temp.txt"))).fileName()));
     QVERIFY(QFile::remove(QDir::temp().filePath(QStringLiteral("via-temp.txt"))));
