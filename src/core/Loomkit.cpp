@@ -6,6 +6,7 @@
 #include "FileUtility.h"
 #include "LoomkitLogging.h"
 #include "StandardPaths.h"
+#include "XmlUtility.h"
 #include "platform/AppUtilsPrivate.h"
 
 #include "BinaryData.h"
@@ -888,4 +889,16 @@ VersionNumber *Loomkit::versionNumber(const QString &versionString)
 int Loomkit::compareVersionNumber(const QVariant &version1, const QVariant &version2)
 {
     return QVersionNumber::compare(VersionNumber::toVersion(version1), VersionNumber::toVersion(version2));
+}
+
+// Text data parsers
+
+QVariantMap Loomkit::xmlToJson(const QString &xml, const QVariantMap &options)
+{
+    return XmlUtility::toVariantMap(xml, options);
+}
+
+QVariantMap Loomkit::xmlToJson(const QString &xml)
+{
+    return XmlUtility::toVariantMap(xml, QVariantMap());
 }

@@ -156,6 +156,10 @@ public:
     Q_INVOKABLE VersionNumber *versionNumber(const QString &versionString);
     Q_INVOKABLE int compareVersionNumber(const QVariant &version1, const QVariant &version2);
 
+    // Text data parsers
+    Q_INVOKABLE QVariantMap xmlToJson(const QString &xml, const QVariantMap &options);
+    Q_INVOKABLE QVariantMap xmlToJson(const QString &xml);
+
 signals:
     void userHomePathChanged();
     void offlineStoragePathChanged();

@@ -1,4 +1,5 @@
 #include "FileFolder.h"
+#include "CsvParser.h"
 #include "File.h"
 #include "FileFolderWorker.h"
 #include "FileInfo.h"
@@ -6,13 +7,17 @@
 #include "JsonUtility.h"
 #include "LoomkitLogging.h"
 #include "Settings.h"
+#include "XmlUtility.h"
 
 #include <QDirIterator>
 #include <QFile>
 #include <QFileInfo>
+#include <QJSEngine>
 #include <QJSValue>
 #include <QQmlEngine>
+#include <QRegularExpression>
 #include <QStandardPaths>
+#include <QTextCodec>
 #include <QThread>
 
 #include <cerrno>
@@ -215,6 +220,24 @@ bool copyRegularFile(const QString &source, const QString &target, QString *erro
     if (!copied)
         out.remove();
     return copied;
+}
+
+// XML text in the encoding its bytes say: a byte order mark, or else the
+// declaration's encoding, or else UTF-8.
+QString xmlText(const QByteArray &bytes)
+{
+    QTextCodec *codec = QTextCodec::codecForUtfText(bytes, nullptr);
+    if (!codec) {
+        static const QRegularExpression declaration(
+            QStringLiteral("^\\s*<\\?xml[^>]*\\sencoding\\s*=\\s*[\"']([A-Za-z0-9._:-]+)[\"']"));
+        const QRegularExpressionMatch match = declaration.match(QString::fromLatin1(bytes.left(256)));
+        if (match.hasMatch())
+            codec = QTextCodec::codecForName(match.captured(1).toLatin1());
+    }
+    QString text = codec ? codec->toUnicode(bytes) : QString::fromUtf8(bytes);
+    if (text.startsWith(QChar(QChar::ByteOrderMark)))
+        text.remove(0, 1);
+    return text;
 }
 
 } // namespace
@@ -853,6 +876,53 @@ Settings *FileFolder::settingsFile(const QString &fileName)
     auto *settings = new Settings(m_dir.filePath(name), QSettings::IniFormat);
     QQmlEngine::setObjectOwnership(settings, QQmlEngine::JavaScriptOwnership);
     return settings;
+}
+
+QVariantMap FileFolder::readXmlFile(const QString &fileName)
+{
+    bool ok = false;
+    const QByteArray bytes = readFileData(m_dir.filePath(fileName), &ok);
+    if (!ok)
+        return QVariantMap();
+    return XmlUtility::toVariantMap(xmlText(bytes));
+}
+
+void FileFolder::throwScriptError(const QString &message)
+{
+    if (QJSEngine *engine = qjsEngine(this)) {
+        engine->throwError(message);
+        return;
+    }
+    // Called from C++ alone: there is no script to raise the error in.
+    qCWarning(lcFile) << Q_FUNC_INFO << message;
+}
+
+QVariant FileFolder::readCsvFile(const QString &fileName, const QVariantMap &options)
+{
+    const QString path = m_dir.filePath(fileName);
+    // Opening a fifo or a device would block or never end.
+    const QFileInfo info(path);
+    if (info.exists() && !info.isFile()) {
+        throwScriptError(QStringLiteral("Error reading CSV file:") + QStringLiteral("Not a regular file."));
+        return QVariant();
+    }
+
+    QFile file(path);
+    CsvParser parser(&file);
+    if (!parser.setOptions(options)) {
+        throwScriptError(QStringLiteral("Error setting headers for CSV file from options."));
+        return QVariant();
+    }
+    if (!parser.parse()) {
+        throwScriptError(QStringLiteral("Error reading CSV file:") + parser.errorString());
+        return QVariant();
+    }
+    return parser.records();
+}
+
+QVariant FileFolder::readCsvFile(const QString &fileName)
+{
+    return readCsvFile(fileName, QVariantMap());
 }
 
 void FileFolder::refresh()

@@ -99,6 +99,9 @@ public:
     Q_INVOKABLE QString readTextFile(const QString &fileName);
     Q_INVOKABLE bool writeTextFile(const QString &fileName, const QString &text);
     Q_INVOKABLE Settings *settingsFile(const QString &fileName);
+    Q_INVOKABLE QVariantMap readXmlFile(const QString &fileName);
+    Q_INVOKABLE QVariant readCsvFile(const QString &fileName, const QVariantMap &options);
+    Q_INVOKABLE QVariant readCsvFile(const QString &fileName);
 
     Q_INVOKABLE void refresh();
     Q_INVOKABLE QVariant moveFileToTrash(const QString &fileName);
@@ -126,6 +129,7 @@ private:
     bool checkConstant(const char *function) const;
     bool checkReadOnly(const char *function) const;
     QStringList entryNames(const QVariant &nameFilter, bool subFolders, QDir::Filters filters) const;
+    void throwScriptError(const QString &message);
     void notifyMovedFileToTrash(const QString &originalFile, const QVariant &pathInTrash, const QString &error);
     bool writeDevice(const QString &filePath, QIODevice *device) const;
     static bool copyFolder(const QString &source, const QString &target, QStringList *chain);

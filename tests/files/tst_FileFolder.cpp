@@ -6,6 +6,8 @@
 #include "Settings.h"
 
 #include <QBuffer>
+#include <QJSEngine>
+#include <QTextCodec>
 #include <QDir>
 #include <QFile>
 #include <QQmlEngine>
@@ -77,6 +79,11 @@ private slots:
     void renameFile();
     void settingsFile_data();
     void settingsFile();
+    void readXmlFile_data();
+    void readXmlFile();
+    void readCsvFile_data();
+    void readCsvFile();
+    void readCsvFileWithoutScript();
     void fileHelpers();
     void factories();
     void trash();
@@ -656,6 +663,81 @@ void tst_FileFolder::settingsFile()
     QVERIFY(contents(path(expected)).contains("[group]"));
     QScopedPointer<Settings> again(folder.settingsFile(name));
     QCOMPARE(again->value(QStringLiteral("group/key")).toString(), QStringLiteral("value"));
+}
+
+void tst_FileFolder::readXmlFile_data()
+{
+    QTest::addColumn<QByteArray>("bytes");
+    QTest::addColumn<QString>("expected");
+
+    const QString text = QString::fromUtf8("Grüße ✓");
+    QTest::newRow("utf-8") << (QByteArray("<?xml version=\"1.0\"?><r><t>") + text.toUtf8() + "</t></r>") << text;
+    QTest::newRow("no declaration") << (QByteArray("<r><t>") + text.toUtf8() + "</t></r>") << text;
+    QTest::newRow("latin-1 by declaration")
+        << (QByteArray("<?xml version='1.0' encoding='ISO-8859-1'?>\n<r><t>") + QByteArray("Gr\xfc\xdf" "e") + "</t></r>")
+        << QString::fromUtf8("Grüße");
+    // The codec writes the byte order mark itself.
+    const QByteArray utf16 = QTextCodec::codecForName("UTF-16LE")->fromUnicode(QStringLiteral("<r><t>") + text + QStringLiteral("</t></r>"));
+    QVERIFY(utf16.startsWith("\xff\xfe"));
+    QTest::newRow("utf-16 with byte order mark") << utf16 << text;
+    QTest::newRow("utf-8 with byte order mark") << (QByteArray("\xef\xbb\xbf<r><t>") + text.toUtf8() + "</t></r>") << text;
+}
+
+void tst_FileFolder::readXmlFile()
+{
+    QFETCH(QByteArray, bytes);
+    QFETCH(QString, expected);
+
+    QVERIFY(writeBytes(path(QStringLiteral("doc.xml")), bytes));
+    FileFolder folder(m_dir->path());
+    const QVariantMap map = folder.readXmlFile(QStringLiteral("doc.xml"));
+    QCOMPARE(map.value(QStringLiteral("t")).toString(), expected);
+
+    QVERIFY(folder.readXmlFile(QStringLiteral("missing.xml")).isEmpty());
+    QVERIFY(writeBytes(path(QStringLiteral("broken.xml")), "<r><t>open"));
+    QVERIFY(folder.readXmlFile(QStringLiteral("broken.xml")).isEmpty());
+}
+
+void tst_FileFolder::readCsvFile_data()
+{
+    QTest::addColumn<QString>("call");
+    QTest::addColumn<QString>("expected");
+
+    QTest::newRow("records") << "JSON.stringify(folder.readCsvFile('a.csv'))"
+                             << R"([{"n":1,"name":"x"},{"n":2.5,"name":"y, z"}])";
+    QTest::newRow("explicit fields") << "JSON.stringify(folder.readCsvFile('a.csv', { fields: ['p', 'q'] })[1])"
+                                     << R"({"p":"x","q":1})";
+    QTest::newRow("bad fields") << "folder.readCsvFile('a.csv', { fields: ['p', 'p'] })"
+                                << "Error: Error setting headers for CSV file from options.";
+    QTest::newRow("missing file") << "folder.readCsvFile('none.csv')"
+                                  << "Error: Error reading CSV file:Open QIODevice failed.";
+    QTest::newRow("bad header row") << "folder.readCsvFile('dup.csv')"
+                                    << "Error: Error reading CSV file:Duplicate or empty header name: \"a\" at header no.2";
+    QTest::newRow("fifo") << "folder.readCsvFile('pipe.csv')"
+                          << "Error: Error reading CSV file:Not a regular file.";
+}
+
+void tst_FileFolder::readCsvFile()
+{
+    QFETCH(QString, call);
+    QFETCH(QString, expected);
+
+    QVERIFY(writeBytes(path(QStringLiteral("a.csv")), "name,n\nx,1\n\"y, z\",2.5\n"));
+    QVERIFY(writeBytes(path(QStringLiteral("dup.csv")), "a,a\n1,2\n"));
+    QVERIFY(::mkfifo(QFile::encodeName(path(QStringLiteral("pipe.csv"))).constData(), 0600) == 0);
+
+    QJSEngine engine;
+    engine.globalObject().setProperty(QStringLiteral("folder"), engine.newQObject(new FileFolder(m_dir->path())));
+    const QJSValue result = engine.evaluate(QStringLiteral("(function() { try { return %1 } catch (e) { return String(e) } })()").arg(call));
+    QCOMPARE(result.toString(), expected);
+}
+
+void tst_FileFolder::readCsvFileWithoutScript()
+{
+    // No script to raise the error in: a warning and no result.
+    FileFolder folder(m_dir->path());
+    QTest::ignoreMessage(QtWarningMsg, QRegularExpression(QStringLiteral("Error reading CSV file:")));
+    QVERIFY(!folder.readCsvFile(QStringLiteral("none.csv")).isValid());
 }
 
 void tst_FileFolder::fileHelpers()

@@ -127,6 +127,25 @@ TestCase {
         verify(work.readTextFile("none.txt") === "")
     }
 
+    function test_csvAndXml() {
+        verify(work.writeTextFile("t.csv", "a,b\n1,two\n"))
+        var rows = work.readCsvFile("t.csv")
+        compare(rows.length, 1)
+        compare(rows[0].a, 1)
+        compare(rows[0].b, "two")
+
+        var message = ""
+        try {
+            work.readCsvFile("none.csv")
+        } catch (error) {
+            message = error.message
+        }
+        compare(message, "Error reading CSV file:Open QIODevice failed.")
+
+        verify(work.writeTextFile("t.xml", "<r><a>1</a></r>"))
+        compare(work.readXmlFile("t.xml").a, "1")
+    }
+
     function test_fileStream() {
         var file = createTemporaryObject(fileComponent, this, { path: work.filePath("stream.txt") })
         var positionSpy = createTemporaryObject(spyComponent, this, { target: file, signalName: "positionChanged" })
