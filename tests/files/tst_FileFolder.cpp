@@ -86,6 +86,7 @@ private slots:
     void readCsvFileWithoutScript();
     void fileHelpers();
     void factories();
+    void folderWithoutPermission();
     void trash();
     void trashWithoutDataFolder();
     void trashUnusable();
@@ -784,6 +785,32 @@ void tst_FileFolder::factories()
     QCOMPARE(QQmlEngine::objectOwnership(child.data()), QQmlEngine::JavaScriptOwnership);
     QVERIFY(child->makeFolder());
     QVERIFY(child->cdUp());
+}
+
+void tst_FileFolder::folderWithoutPermission()
+{
+    QVERIFY(writeBytes(path(QStringLiteral("closed/inner/a.txt")), "a"));
+    QVERIFY(writeBytes(path(QStringLiteral("closed/b.txt")), "b"));
+    if (::geteuid() == 0)
+        QSKIP("Permission checks don't apply to the superuser");
+    QVERIFY(QFile::setPermissions(path(QStringLiteral("closed")), QFileDevice::ExeOwner));
+
+    FileFolder folder(path(QStringLiteral("closed")));
+    QVERIFY(folder.exists());
+    QVERIFY(folder.fileNames(QVariant(), true).isEmpty());
+    QVERIFY(folder.folderNames(QVariant(), true).isEmpty());
+    QCOMPARE(folder.size(), qlonglong(0));
+    // Known names still work through the search right.
+    QCOMPARE(folder.readTextFile(QStringLiteral("b.txt")), QStringLiteral("b"));
+    QTest::ignoreMessage(QtWarningMsg, QRegularExpression(QStringLiteral("Error opening")));
+    QVERIFY(!folder.writeTextFile(QStringLiteral("new.txt"), QStringLiteral("n")));
+
+    FileFolder parent(m_dir->path());
+    QTest::ignoreMessage(QtCriticalMsg, QRegularExpression(QStringLiteral("File is not readable:")));
+    QVERIFY(!parent.copyFile(QStringLiteral("closed"), path(QStringLiteral("copy"))));
+    QVERIFY(!QFileInfo::exists(path(QStringLiteral("copy"))));
+
+    QVERIFY(QFile::setPermissions(path(QStringLiteral("closed")), QFileDevice::ReadOwner | QFileDevice::WriteOwner | QFileDevice::ExeOwner));
 }
 
 void tst_FileFolder::trash()
