@@ -746,18 +746,12 @@ void tst_FileFolder::fileHelpers()
     QVERIFY(writeBytes(path(QStringLiteral("f.txt")), "f"));
     FileFolder folder(m_dir->path());
 
-    QCOMPARE(folder.filePath(QStringLiteral("f.txt")), path(QStringLiteral("f.txt")));
-    QCOMPARE(folder.filePath(QStringLiteral("/abs/x")), QStringLiteral("/abs/x"));
-    QCOMPARE(folder.relativeFilePath(path(QStringLiteral("sub/g.txt"))), QStringLiteral("sub/g.txt"));
     QCOMPARE(folder.fileUrl(QStringLiteral("f.txt")), QUrl::fromLocalFile(path(QStringLiteral("f.txt"))));
     QVERIFY(folder.fileExists(QStringLiteral("f.txt")));
     QVERIFY(!folder.fileExists(QStringLiteral("g.txt")));
     QVERIFY(folder.removeFile(QStringLiteral("f.txt")));
     QVERIFY(!folder.fileExists(QStringLiteral("f.txt")));
     QVERIFY(!folder.removeFile(QStringLiteral("f.txt")));
-
-    QCOMPARE(folder.toNativeSeparators(QStringLiteral("a/b")), QDir::toNativeSeparators(QStringLiteral("a/b")));
-    QCOMPARE(folder.fromNativeSeparators(QStringLiteral("a/b")), QStringLiteral("a/b"));
 
     FileFolder resources(QStringLiteral(":/"));
     QCOMPARE(resources.fileUrl(QStringLiteral("x/y.png")), QUrl(QStringLiteral("qrc:///x/y.png")));
