@@ -116,6 +116,10 @@ void tst_File::lastLineWithoutEnding_data()
     QTest::newRow("utf8") << int(File::TextEncodingUtf8) << QByteArray("a\nlast") << QStringList { "a\n", "last" };
     QTest::newRow("utf16") << int(File::TextEncodingUtf16) << utf16Bytes(QStringLiteral("a\nlast"))
                            << QStringList { "a\n", "last" };
+    // Lines decode as C strings: a NUL ends the text of its line, while the
+    // position still moves past the whole line.
+    QTest::newRow("latin1 with NUL") << int(File::TextEncodingLatin1) << QByteArray("a\0b\nc", 5)
+                                     << QStringList { "a", "c" };
     // An odd byte at the end of UTF-16 text is half a character: dropped.
     QTest::newRow("utf16 odd tail") << int(File::TextEncodingUtf16) << utf16Bytes(QStringLiteral("ab")) + "\n"
                                     << QStringList { "ab" };
