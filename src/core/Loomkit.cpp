@@ -1,9 +1,21 @@
 #include "Loomkit.h"
+#include "Environment.h"
+#include "File.h"
+#include "FileFolder.h"
+#include "FileInfo.h"
 #include "FileUtility.h"
 #include "LoomkitLogging.h"
 #include "Network.h"
+#include "StandardPaths.h"
 #include "XmlUtility.h"
 #include "platform/AppUtilsPrivate.h"
+
+#include "BinaryData.h"
+#include "LocaleInfo.h"
+#include "Settings.h"
+#include "UrlInfo.h"
+#include "Uuid.h"
+#include "VersionNumber.h"
 
 #include <QClipboard>
 #include <QCoreApplication>
@@ -101,7 +113,7 @@ Loomkit *Loomkit::instance(QQmlEngine *engine)
     return s_instance;
 }
 
-// Networking (subsystem 4)
+// Networking
 
 Loomkit *Loomkit::current()
 {
@@ -782,6 +794,145 @@ bool Loomkit::isAppInstalled(const QStringList &appIdentifierValues)
             return true;
     }
     return false;
+}
+
+// Files, folders, storage and the environment
+
+FileFolder *Loomkit::userHomeFolder()
+{
+    // A new object at each read, as a property value: no parent, and the
+    // engine does not take it over.
+    return new FileFolder(userHomePath());
+}
+
+FileFolder *Loomkit::temporaryFolder() const
+{
+    return new FileFolder(QDir::temp());
+}
+
+StandardPaths *Loomkit::standardPaths()
+{
+    if (!m_standardPaths)
+        m_standardPaths = new StandardPaths(this);
+    return m_standardPaths;
+}
+
+Environment *Loomkit::environment()
+{
+    if (!m_environment)
+        m_environment = new Environment(this);
+    return m_environment;
+}
+
+namespace {
+
+template <typename T>
+T *scriptOwned(T *object)
+{
+    QQmlEngine::setObjectOwnership(object, QQmlEngine::JavaScriptOwnership);
+    return object;
+}
+
+} // namespace
+
+File *Loomkit::file(const QString &path)
+{
+    return scriptOwned(new File(path));
+}
+
+File *Loomkit::file(const QUrl &pathUrl)
+{
+    return scriptOwned(new File(pathUrl));
+}
+
+FileFolder *Loomkit::fileFolder(const QString &path)
+{
+    return scriptOwned(new FileFolder(path));
+}
+
+FileFolder *Loomkit::fileFolder(const QUrl &pathUrl)
+{
+    return scriptOwned(new FileFolder(pathUrl));
+}
+
+FileInfo *Loomkit::fileInfo(const QString &path)
+{
+    return scriptOwned(new FileInfo(path));
+}
+
+FileInfo *Loomkit::fileInfo(const QUrl &pathUrl)
+{
+    return scriptOwned(new FileInfo(pathUrl));
+}
+
+// Settings, binary data and value objects
+
+Settings *Loomkit::settings()
+{
+    if (!m_settings)
+        m_settings = new Settings(this);
+    return m_settings;
+}
+
+BinaryData *Loomkit::binaryData(const QJSValue &value)
+{
+    return BinaryData::create(value, BinaryData::TextEncodingUtf8);
+}
+
+BinaryData *Loomkit::binaryData()
+{
+    return binaryData(QJSValue(QJSValue::UndefinedValue));
+}
+
+UrlInfo *Loomkit::urlInfo(const QUrl &url)
+{
+    return UrlInfo::create(url);
+}
+
+QVariant Loomkit::uuid()
+{
+    return Uuid::createUuid().toVariant();
+}
+
+QVariant Loomkit::uuid(const QString &uuid)
+{
+    return Uuid::fromString(uuid).toVariant();
+}
+
+QVariant Loomkit::uuid(const QByteArray &rfc4122)
+{
+    return Uuid::fromRfc4122(rfc4122).toVariant();
+}
+
+LocaleInfo *Loomkit::localeInfo(const QJSValue &locale)
+{
+    if (locale.isNull() || locale.isUndefined())
+        return LocaleInfo::create(QLocale());
+    // A Qt.locale() object reads "[object Object]" as text; its name is meant.
+    const QJSValue name = locale.isObject() ? locale.property(QStringLiteral("name")) : QJSValue();
+    return LocaleInfo::create(QLocale(name.isString() ? name.toString() : locale.toString()));
+}
+
+LocaleInfo *Loomkit::localeInfo()
+{
+    return localeInfo(QJSValue(QJSValue::UndefinedValue));
+}
+
+VersionNumber *Loomkit::versionNumber(int major, int minor, int micro)
+{
+    return VersionNumber::create(QVersionNumber(major, minor, micro));
+}
+
+VersionNumber *Loomkit::versionNumber(const QString &versionString)
+{
+    VersionNumber *version = VersionNumber::create(QVersionNumber());
+    version->setVersionString(versionString);
+    return version;
+}
+
+int Loomkit::compareVersionNumber(const QVariant &version1, const QVariant &version2)
+{
+    return QVersionNumber::compare(VersionNumber::toVersion(version1), VersionNumber::toVersion(version2));
 }
 
 // Text data parsers

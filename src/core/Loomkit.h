@@ -11,12 +11,23 @@
 #include <QVariant>
 #include <QVariantMap>
 
+#include "Environment.h"
+#include "File.h"
+#include "FileFolder.h"
+#include "FileInfo.h"
+#include "StandardPaths.h"
+
 class QQmlEngine;
 class QQuickItem;
 class QQuickWindow;
 class QImage;
 class AppUtilsPrivate;
 class Network;
+class BinaryData;
+class LocaleInfo;
+class Settings;
+class UrlInfo;
+class VersionNumber;
 
 // The module's one QML singleton, shared by every engine of the process.
 class Loomkit : public QObject
@@ -39,7 +50,7 @@ class Loomkit : public QObject
     Q_PROPERTY(QString currentCpuArchitecture READ currentCpuArchitecture CONSTANT)
     Q_PROPERTY(QVariantMap systemInformation READ systemInformation CONSTANT)
     Q_PROPERTY(double displayScaleFactor READ displayScaleFactor WRITE setDisplayScaleFactor NOTIFY displayScaleFactorChanged)
-    // Networking (subsystem 4)
+    // Networking
     Q_PROPERTY(Network *network READ network CONSTANT)
     Q_PROPERTY(bool isOnline READ isOnline NOTIFY onlineStateChanged)
     Q_PROPERTY(QStringList importPathList READ importPathList WRITE setImportPathList NOTIFY importPathListChanged)
@@ -47,13 +58,22 @@ class Loomkit : public QObject
     Q_PROPERTY(QStringList availableLocaleNames READ availableLocaleNames CONSTANT)
     Q_PROPERTY(QString systemLocale READ systemLocale CONSTANT)
 
+    // Files, folders, storage and the environment
+    Q_PROPERTY(FileFolder *userHomeFolder READ userHomeFolder NOTIFY userHomePathChanged)
+    Q_PROPERTY(FileFolder *temporaryFolder READ temporaryFolder CONSTANT)
+    Q_PROPERTY(StandardPaths *standardPaths READ standardPaths CONSTANT)
+    Q_PROPERTY(Environment *environment READ environment CONSTANT)
+
+    // Settings, binary data and value objects
+    Q_PROPERTY(Settings *settings READ settings CONSTANT)
+
 public:
     explicit Loomkit(QObject *parent = nullptr);
     ~Loomkit() override;
 
     static Loomkit *instance(QQmlEngine *engine);
 
-    // Networking (subsystem 4)
+    // Networking
     // The process-wide object if one exists; never creates it.
     static Loomkit *current();
     Network *network();
@@ -120,6 +140,32 @@ public:
     Q_INVOKABLE bool isAppInstalled(const QString &appIdentifier);
     Q_INVOKABLE bool isAppInstalled(const QStringList &appIdentifierValues);
 
+    // Files, folders, storage and the environment
+    FileFolder *userHomeFolder();
+    FileFolder *temporaryFolder() const;
+    StandardPaths *standardPaths();
+    Environment *environment();
+    Q_INVOKABLE File *file(const QString &path);
+    Q_INVOKABLE File *file(const QUrl &pathUrl);
+    Q_INVOKABLE FileFolder *fileFolder(const QString &path);
+    Q_INVOKABLE FileFolder *fileFolder(const QUrl &pathUrl);
+    Q_INVOKABLE FileInfo *fileInfo(const QString &path);
+    Q_INVOKABLE FileInfo *fileInfo(const QUrl &pathUrl);
+
+    // Settings, binary data and value objects
+    Settings *settings();
+    Q_INVOKABLE BinaryData *binaryData(const QJSValue &value);
+    Q_INVOKABLE BinaryData *binaryData();
+    Q_INVOKABLE UrlInfo *urlInfo(const QUrl &url);
+    Q_INVOKABLE QVariant uuid();
+    Q_INVOKABLE QVariant uuid(const QString &uuid);
+    Q_INVOKABLE QVariant uuid(const QByteArray &rfc4122);
+    Q_INVOKABLE LocaleInfo *localeInfo(const QJSValue &locale);
+    Q_INVOKABLE LocaleInfo *localeInfo();
+    Q_INVOKABLE VersionNumber *versionNumber(int major, int minor, int micro);
+    Q_INVOKABLE VersionNumber *versionNumber(const QString &versionString);
+    Q_INVOKABLE int compareVersionNumber(const QVariant &version1, const QVariant &version2);
+
     // Text data parsers
     Q_INVOKABLE QVariantMap xmlToJson(const QString &xml, const QVariantMap &options);
     Q_INVOKABLE QVariantMap xmlToJson(const QString &xml);
@@ -144,10 +190,13 @@ private:
 
     QDir m_userHome;
     double m_displayScaleFactor = 0;
+    Settings *m_settings = nullptr;
     QStringList m_availableLocaleNames;
-    // Networking (subsystem 4)
+    // Networking
     Network *m_network = nullptr;
     AppUtilsPrivate *m_appUtils = nullptr;
+    Environment *m_environment = nullptr;
+    StandardPaths *m_standardPaths = nullptr;
 };
 
 #endif // LOOMKIT_H

@@ -1,15 +1,30 @@
 #include "LoomkitPlugin.h"
+#include "AuthenticationChallenge.h"
+#include "BinaryData.h"
+#include "CryptographicHash.h"
+#include "Environment.h"
+#include "File.h"
+#include "FileFolder.h"
+#include "FileInfo.h"
+#include "InputValidator.h"
+#include "LocaleInfo.h"
 #include "Loomkit.h"
 #include "LoomkitError.h"
 #include "LoomkitLogging.h"
 #include "LoomkitObject.h"
-// Networking (subsystem 4) and property sets (subsystem 2)
-#include "AuthenticationChallenge.h"
+#include "MessageAuthenticationCode.h"
 #include "Network.h"
 #include "NetworkProxy.h"
 #include "NetworkRequest.h"
 #include "NetworkRequestHeaders.h"
 #include "PropertySet.h"
+#include "Settings.h"
+#include "SettingsBase.h"
+#include "StandardPaths.h"
+#include "StorageInfo.h"
+#include "UrlInfo.h"
+#include "Uuid.h"
+#include "VersionNumber.h"
 #include "ZipFileInfo.h"
 #include "ZipReader.h"
 #include "ZipWriter.h"
@@ -56,21 +71,37 @@ void LoomkitPlugin::registerTypes(const char *uri)
 
     initResources();
 
+    // The table of types, top to bottom. "Settings" is registered twice on
+    // purpose: first the uncreatable base, then the creatable element.
     qmlRegisterSingletonType<Loomkit>(uri, 1, 0, "Loomkit", &LoomkitPlugin::loomkitProvider);
     registerUncreatable<LoomkitObject>(uri, "LoomkitObject", "The Orvane type LoomkitObject is not creatable");
     registerUncreatable<LoomkitError>(uri, "LoomkitError", "The Orvane type LoomkitError is not creatable");
-    // rows 13-16 and 19: networking
+    registerUncreatable<Environment>(uri, "Environment", "The Orvane type Environment is not creatable");
+    registerUncreatable<SettingsBase>(uri, "Settings", "The Orvane type Settings is not creatable");
     registerUncreatable<Network>(uri, "Network", "The Orvane type Network is not creatable");
     registerUncreatable<NetworkProxy>(uri, "NetworkProxy", "The Orvane type NetworkProxy is not creatable");
     qmlRegisterType<NetworkRequest>(uri, 1, 0, "NetworkRequest");
     qmlRegisterType<NetworkRequestHeaders>(uri, 1, 0, "NetworkRequestHeaders");
+    qmlRegisterType<CryptographicHash>(uri, 1, 0, "CryptographicHash");
+    qmlRegisterType<MessageAuthenticationCode>(uri, 1, 0, "MessageAuthenticationCode");
     qmlRegisterType<AuthenticationChallenge>(uri, 1, 0, "AuthenticationChallenge");
-    // row 38
-    qmlRegisterType<PropertySet>(uri, 1, 0, "PropertySet");
-
+    qmlRegisterType<UrlInfo>(uri, 1, 0, "UrlInfo");
+    qmlRegisterType<LocaleInfo>(uri, 1, 0, "LocaleInfo");
+    qmlRegisterType<File>(uri, 1, 0, "File");
+    qmlRegisterType<FileInfo>(uri, 1, 0, "FileInfo");
+    qmlRegisterType<FileFolder>(uri, 1, 0, "FileFolder");
+    qmlRegisterType<Settings>(uri, 1, 0, "Settings");
+    qmlRegisterType<StorageInfo>(uri, 1, 0, "StorageInfo");
     qmlRegisterType<ZipReader>(uri, 1, 0, "ZipReader");
     qmlRegisterType<ZipWriter>(uri, 1, 0, "ZipWriter");
     qmlRegisterType<ZipFileInfo>(uri, 1, 0, "ZipFileInfo");
+    registerUncreatable<StandardPaths>(uri, "StandardPaths", "The Orvane type StandardPaths is not creatable");
+    qRegisterMetaType<StorageInfo::StorageType>("StorageInfo::StorageType");
+    qmlRegisterType<PropertySet>(uri, 1, 0, "PropertySet");
+    qmlRegisterType<BinaryData>(uri, 1, 0, "BinaryData");
+    qmlRegisterType<InputValidator>(uri, 1, 0, "InputValidator");
+    qmlRegisterType<VersionNumber>(uri, 1, 0, "VersionNumber");
+    Uuid::registerMetaType();
 }
 
 void LoomkitPlugin::initializeNetwork()

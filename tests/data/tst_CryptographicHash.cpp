@@ -1,0 +1,210 @@
+#include "BinaryData.h"
+#include "CryptographicHash.h"
+#include "TestSupport.h"
+
+#include <QJSEngine>
+#include <QQmlEngine>
+#include <QRandomGenerator>
+#include <QSignalSpy>
+#include <QTemporaryDir>
+#include <QtTest>
+
+// Python with the Debian crypto module is the oracle: it covers Keccak and
+// MD4, which the openssl command line no longer offers.
+static const QString kPython = QStringLiteral("/usr/bin/python3");
+
+class tst_CryptographicHash : public QObject
+{
+    Q_OBJECT
+
+private slots:
+    void knownVectors_data();
+    void knownVectors();
+    void againstOracle_data();
+    void againstOracle();
+    void incremental();
+    void inputKinds();
+    void algorithmChangeRestarts();
+    void missingFile();
+};
+
+void tst_CryptographicHash::knownVectors_data()
+{
+    QTest::addColumn<int>("algorithm");
+    QTest::addColumn<QByteArray>("input");
+    QTest::addColumn<QString>("hex");
+
+    using H = CryptographicHash;
+    // RFC 1320, RFC 1321 and FIPS 180/202 sample values; Keccak as its authors published.
+    QTest::newRow("md4 abc") << int(H::Md4) << QByteArray("abc") << "a448017aaf21d8525fc10ae87aa6729d";
+    QTest::newRow("md5 empty") << int(H::Md5) << QByteArray() << "d41d8cd98f00b204e9800998ecf8427e";
+    QTest::newRow("md5 abc") << int(H::Md5) << QByteArray("abc") << "900150983cd24fb0d6963f7d28e17f72";
+    QTest::newRow("sha1 abc") << int(H::Sha1) << QByteArray("abc") << "a9993e364706816aba3e25717850c26c9cd0d89d";
+    QTest::newRow("sha224 abc") << int(H::Sha224) << QByteArray("abc")
+                                << "23097d223405d8228642a477bda255b32aadbce4bda0b3f7e36c9da7";
+    QTest::newRow("sha256 abc") << int(H::Sha256) << QByteArray("abc")
+                                << "ba7816bf8f01cfea414140de5dae2223b00361a396177a9cb410ff61f20015ad";
+    QTest::newRow("sha256 two blocks") << int(H::Sha256)
+                                       << QByteArray("abcdbcdecdefdefgefghfghighijhijkijkljklmklmnlmnomnopnopq")
+                                       << "248d6a61d20638b8e5c026930c3e6039a33ce45964ff2167f6ecedd419db06c1";
+    QTest::newRow("sha384 abc") << int(H::Sha384) << QByteArray("abc")
+                                << "cb00753f45a35e8bb5a03d699ac65007272c32ab0eded1631a8b605a43ff5bed"
+                                   "8086072ba1e7cc2358baeca134c825a7";
+    QTest::newRow("sha512 abc") << int(H::Sha512) << QByteArray("abc")
+                                << "ddaf35a193617abacc417349ae20413112e6fa4e89a97ea20a9eeee64b55d39a"
+                                   "2192992a274fc1a836ba3c23a3feebbd454d4423643ce80e2a9ac94fa54ca49f";
+    QTest::newRow("sha3-256 empty") << int(H::Sha3_256) << QByteArray()
+                                    << "a7ffc6f8bf1ed76651c14756a061d662f580ff4de43b49fa82d80a4b80f8434a";
+    QTest::newRow("sha3-512 abc") << int(H::Sha3_512) << QByteArray("abc")
+                                  << "b751850b1a57168a5693cd924b6b096e08f621827444f70d884f5d0240d2712e"
+                                     "10e116e9192af3c91a7ec57647e3934057340b4cf408d5a56592f8274eec53f0";
+    QTest::newRow("keccak-256 empty") << int(H::Keccak_256) << QByteArray()
+                                      << "c5d2460186f7233c927e7db2dcc703c0e500b653ca82273b7bfad8045d85a470";
+    QTest::newRow("keccak-256 abc") << int(H::Keccak_256) << QByteArray("abc")
+                                    << "4e03657aea45a94fc7d47ba826c8d667c0d1e6e33a64a036ec44f58fa12d6c45";
+}
+
+void tst_CryptographicHash::knownVectors()
+{
+    QFETCH(int, algorithm);
+    QFETCH(QByteArray, input);
+    QFETCH(QString, hex);
+
+    CryptographicHash hash;
+    hash.setAlgorithm(CryptographicHash::Algorithm(algorithm));
+    QVERIFY(hash.addBytes(input));
+    QCOMPARE(hash.hex(), hex);
+    QCOMPARE(hash.base64(), QString::fromLatin1(QByteArray::fromHex(hex.toLatin1()).toBase64()));
+    QCOMPARE(hash.hashLength(), hex.size() / 2);
+    QCOMPARE(hash.hash(QJSValue(QString::fromLatin1(input))), hex);
+}
+
+void tst_CryptographicHash::againstOracle_data()
+{
+    QTest::addColumn<int>("algorithm");
+    QTest::addColumn<QString>("expression");
+
+    using H = CryptographicHash;
+    QTest::newRow("md4") << int(H::Md4) << "MD4.new(d)";
+    QTest::newRow("md5") << int(H::Md5) << "hashlib.md5(d)";
+    QTest::newRow("sha1") << int(H::Sha1) << "hashlib.sha1(d)";
+    QTest::newRow("sha224") << int(H::Sha224) << "hashlib.sha224(d)";
+    QTest::newRow("sha256") << int(H::Sha256) << "hashlib.sha256(d)";
+    QTest::newRow("sha384") << int(H::Sha384) << "hashlib.sha384(d)";
+    QTest::newRow("sha512") << int(H::Sha512) << "hashlib.sha512(d)";
+    QTest::newRow("keccak-224") << int(H::Keccak_224) << "keccak.new(digest_bits=224, data=d)";
+    QTest::newRow("keccak-256") << int(H::Keccak_256) << "keccak.new(digest_bits=256, data=d)";
+    QTest::newRow("keccak-384") << int(H::Keccak_384) << "keccak.new(digest_bits=384, data=d)";
+    QTest::newRow("keccak-512") << int(H::Keccak_512) << "keccak.new(digest_bits=512, data=d)";
+    QTest::newRow("sha3-224") << int(H::Sha3_224) << "hashlib.sha3_224(d)";
+    QTest::newRow("sha3-256") << int(H::Sha3_256) << "hashlib.sha3_256(d)";
+    QTest::newRow("sha3-384") << int(H::Sha3_384) << "hashlib.sha3_384(d)";
+    QTest::newRow("sha3-512") << int(H::Sha3_512) << "hashlib.sha3_512(d)";
+}
+
+void tst_CryptographicHash::againstOracle()
+{
+    QFETCH(int, algorithm);
+    QFETCH(QString, expression);
+    if (!QFile::exists(kPython))
+        QSKIP("python3 is not installed");
+
+    // Odd sizes cross block boundaries and the 256 KiB read chunk.
+    QTemporaryDir dir;
+    const QString path = dir.filePath(QStringLiteral("data.bin"));
+    QByteArray bytes(300 * 1024 + 7, Qt::Uninitialized);
+    QRandomGenerator generator(algorithm + 11);
+    for (char &c : bytes)
+        c = char(generator.bounded(256));
+    QFile file(path);
+    QVERIFY(file.open(QIODevice::WriteOnly));
+    file.write(bytes);
+    file.close();
+
+    int exitCode = 0;
+    const QString script = QStringLiteral("import sys, hashlib\n"
+                                          "from Cryptodome.Hash import keccak, MD4\n"
+                                          "d = open(sys.argv[1], 'rb').read()\n"
+                                          "print(%1.hexdigest())\n").arg(expression);
+    const QByteArray expected = TestSupport::run(kPython, { QStringLiteral("-c"), script, path }, &exitCode).trimmed();
+    if (exitCode != 0)
+        QSKIP("python3-pycryptodome is not installed");
+
+    CryptographicHash hash;
+    hash.setAlgorithm(CryptographicHash::Algorithm(algorithm));
+    QVERIFY(hash.addFile(path));
+    QCOMPARE(hash.hex().toLatin1(), expected);
+}
+
+void tst_CryptographicHash::incremental()
+{
+    CryptographicHash hash;
+    QSignalSpy spy(&hash, &CryptographicHash::resultChanged);
+    hash.addBytes("ab");
+    // Reading the result midway must not end the stream.
+    QCOMPARE(hash.hex(), QString::fromLatin1(QCryptographicHash::hash("ab", QCryptographicHash::Sha256).toHex()));
+    hash.addBytes("c");
+    QCOMPARE(hash.hex(), QStringLiteral("ba7816bf8f01cfea414140de5dae2223b00361a396177a9cb410ff61f20015ad"));
+    QCOMPARE(spy.count(), 2);
+
+    QScopedPointer<BinaryData> result(hash.result());
+    QCOMPARE(result->hex(), hash.hex());
+
+    hash.reset();
+    QCOMPARE(hash.hex(), QStringLiteral("e3b0c44298fc1c149afbf4c8996fb92427ae41e4649b934ca495991b7852b855"));
+}
+
+void tst_CryptographicHash::inputKinds()
+{
+    QJSEngine engine;
+    const QString abc = QStringLiteral("ba7816bf8f01cfea414140de5dae2223b00361a396177a9cb410ff61f20015ad");
+
+    CryptographicHash fromBuffer;
+    QVERIFY(fromBuffer.addData(engine.evaluate(QStringLiteral("new Uint8Array([97, 98, 99]).buffer"))));
+    QCOMPARE(fromBuffer.hex(), abc);
+
+    BinaryData bytes;
+    bytes.setData(QByteArray("abc"));
+    QQmlEngine::setObjectOwnership(&bytes, QQmlEngine::CppOwnership);
+    CryptographicHash fromObject;
+    QVERIFY(fromObject.addData(engine.newQObject(&bytes)));
+    QCOMPARE(fromObject.hex(), abc);
+
+    // Text is UTF-8.
+    CryptographicHash fromText;
+    QVERIFY(fromText.addData(QJSValue(QStringLiteral("\u00e9"))));
+    QCOMPARE(fromText.resultBytes(), QCryptographicHash::hash("\xc3\xa9", QCryptographicHash::Sha256));
+
+    CryptographicHash bad;
+    QTest::ignoreMessage(QtWarningMsg, QRegularExpression("Unsupported data type"));
+    QVERIFY(!bad.addData(QJSValue()));
+    QTest::ignoreMessage(QtWarningMsg, QRegularExpression("Unsupported data type"));
+    QVERIFY(bad.hash(engine.evaluate(QStringLiteral("({ a: 1 })"))).isEmpty());
+}
+
+void tst_CryptographicHash::algorithmChangeRestarts()
+{
+    CryptographicHash hash;
+    hash.addBytes("abc");
+    QSignalSpy spy(&hash, &CryptographicHash::algorithmChanged);
+    hash.setAlgorithm(CryptographicHash::Md5);
+    QCOMPARE(spy.count(), 1);
+    QCOMPARE(hash.hex(), QStringLiteral("d41d8cd98f00b204e9800998ecf8427e"));
+    hash.setAlgorithm(CryptographicHash::Md5);
+    QCOMPARE(spy.count(), 1);
+
+    QTest::ignoreMessage(QtWarningMsg, QRegularExpression("Unsupported algorithm"));
+    hash.setAlgorithm(CryptographicHash::Algorithm(99));
+    QCOMPARE(hash.algorithm(), CryptographicHash::Md5);
+}
+
+void tst_CryptographicHash::missingFile()
+{
+    CryptographicHash hash;
+    QTest::ignoreMessage(QtWarningMsg, QRegularExpression("Cannot open"));
+    QVERIFY(!hash.addFile(QStringLiteral("/nonexistent/file")));
+    QCOMPARE(hash.hex(), QStringLiteral("e3b0c44298fc1c149afbf4c8996fb92427ae41e4649b934ca495991b7852b855"));
+}
+
+QTEST_MAIN(tst_CryptographicHash)
+#include "tst_CryptographicHash.moc"
