@@ -12,7 +12,7 @@ PACKAGES="
  qt5-image-formats-plugins
  zlib1g-dev libminizip-dev
  zip unzip libimage-exiftool-perl exiv2
- python3 python3-xmltodict python3-pycryptodome curl openssl rsyslog
+ python3 python3-xmltodict python3-pycryptodome curl openssl libssl-dev rsyslog
  clang libclang-rt-14-dev
 "
 missing=""

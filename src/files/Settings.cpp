@@ -9,19 +9,6 @@
 
 namespace {
 
-bool readJsonFile(QIODevice &device, QSettings::SettingsMap &map)
-{
-    // An empty or damaged file is an empty store, not an error.
-    map = JsonUtility::fromString(QString::fromUtf8(device.readAll()));
-    return true;
-}
-
-bool writeJsonFile(QIODevice &device, const QSettings::SettingsMap &map)
-{
-    const QByteArray json = JsonUtility::toJson(map);
-    return device.write(json) >= json.size();
-}
-
 bool isBlankString(const QVariant &value)
 {
     return value.userType() == QMetaType::QString && value.toString().trimmed().isEmpty();
@@ -57,11 +44,24 @@ Settings::Settings(const QString &fileName, QSettings::Format format, QObject *p
 {
 }
 
+bool Settings::readJson(QIODevice &device, QSettings::SettingsMap &map)
+{
+    // An empty or damaged file is an empty store, not an error.
+    map = JsonUtility::fromString(QString::fromUtf8(device.readAll()));
+    return true;
+}
+
+bool Settings::writeJson(QIODevice &device, const QSettings::SettingsMap &map)
+{
+    const QByteArray json = JsonUtility::toJson(map);
+    return device.write(json) >= json.size();
+}
+
 QSettings::Format Settings::jsonFormat()
 {
     static QSettings::Format format = QSettings::InvalidFormat;
     if (format <= QSettings::InvalidFormat)
-        format = QSettings::registerFormat(QStringLiteral("json"), readJsonFile, writeJsonFile, Qt::CaseSensitive);
+        format = QSettings::registerFormat(QStringLiteral("json"), readJson, writeJson, Qt::CaseSensitive);
     qCDebug(lcFile) << Q_FUNC_INFO << "Format" << format;
     return format;
 }
