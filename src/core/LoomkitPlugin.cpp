@@ -61,16 +61,18 @@ void LoomkitPlugin::registerTypes(const char *uri)
     registerUncreatable<LoomkitObject>(uri, "LoomkitObject", "The Orvane type LoomkitObject is not creatable");
     registerUncreatable<LoomkitError>(uri, "LoomkitError", "The Orvane type LoomkitError is not creatable");
 
-    // Rows of the data and settings area, each at its place in the table.
-    registerUncreatable<SettingsBase>(uri, "Settings", "The Orvane type Settings is not creatable");      // 12
-    qmlRegisterType<CryptographicHash>(uri, 1, 0, "CryptographicHash");                                   // 17
-    qmlRegisterType<MessageAuthenticationCode>(uri, 1, 0, "MessageAuthenticationCode");                   // 18
-    qmlRegisterType<UrlInfo>(uri, 1, 0, "UrlInfo");                                                       // 23
-    qmlRegisterType<LocaleInfo>(uri, 1, 0, "LocaleInfo");                                                 // 24
-    qmlRegisterType<Settings>(uri, 1, 0, "Settings");                                                     // 28
-    qmlRegisterType<BinaryData>(uri, 1, 0, "BinaryData");                                                 // 39
-    qmlRegisterType<InputValidator>(uri, 1, 0, "InputValidator");                                         // 41
-    qmlRegisterType<VersionNumber>(uri, 1, 0, "VersionNumber");                                           // 42
+    // Settings, binary data and value objects, in registration order; the
+    // other areas' types go between them. "Settings" is registered twice on
+    // purpose: the uncreatable base first, the creatable element later.
+    registerUncreatable<SettingsBase>(uri, "Settings", "The Orvane type Settings is not creatable");
+    qmlRegisterType<CryptographicHash>(uri, 1, 0, "CryptographicHash");
+    qmlRegisterType<MessageAuthenticationCode>(uri, 1, 0, "MessageAuthenticationCode");
+    qmlRegisterType<UrlInfo>(uri, 1, 0, "UrlInfo");
+    qmlRegisterType<LocaleInfo>(uri, 1, 0, "LocaleInfo");
+    qmlRegisterType<Settings>(uri, 1, 0, "Settings");
+    qmlRegisterType<BinaryData>(uri, 1, 0, "BinaryData");
+    qmlRegisterType<InputValidator>(uri, 1, 0, "InputValidator");
+    qmlRegisterType<VersionNumber>(uri, 1, 0, "VersionNumber");
     Uuid::registerMetaType();
 }
 
