@@ -1,5 +1,6 @@
 #include "CryptographicHash.h"
 #include "BinaryData.h"
+#include "DigestEngine.h"
 #include "FileUtility.h"
 #include "LoomkitLogging.h"
 
@@ -133,7 +134,7 @@ bool CryptographicHash::addDevice(QIODevice *device)
 
 void CryptographicHash::restart()
 {
-    m_hash.reset(new QCryptographicHash(QCryptographicHash::Algorithm(m_algorithm)));
+    m_hash = std::make_unique<DigestEngine>(QCryptographicHash::Algorithm(m_algorithm));
 }
 
 QByteArray CryptographicHash::digest() const
@@ -143,7 +144,7 @@ QByteArray CryptographicHash::digest() const
 
 QByteArray CryptographicHash::digestOf(const QByteArray &bytes) const
 {
-    return QCryptographicHash::hash(bytes, QCryptographicHash::Algorithm(m_algorithm));
+    return DigestEngine::hash(bytes, QCryptographicHash::Algorithm(m_algorithm));
 }
 
 void CryptographicHash::startOver()

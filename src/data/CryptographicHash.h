@@ -10,6 +10,7 @@
 #include <memory>
 
 class BinaryData;
+class DigestEngine;
 class QIODevice;
 
 // A digest of text, bytes or files for QML. Data is added in pieces; the
@@ -81,7 +82,7 @@ protected:
     void startOver();
 
     Algorithm m_algorithm = Sha256;
-    std::unique_ptr<QCryptographicHash> m_hash;
+    std::unique_ptr<DigestEngine> m_hash;
 
 private:
     mutable QByteArray m_result;

@@ -1,5 +1,6 @@
 #include "MessageAuthenticationCode.h"
 #include "BinaryData.h"
+#include "DigestEngine.h"
 #include "LoomkitLogging.h"
 
 #include <QMessageAuthenticationCode>
@@ -79,17 +80,17 @@ void MessageAuthenticationCode::restart()
 {
     const auto algorithm = QCryptographicHash::Algorithm(m_algorithm);
     const int block = blockSize(m_algorithm);
-    QByteArray key = m_key.size() > block ? QCryptographicHash::hash(m_key, algorithm) : m_key;
+    QByteArray key = m_key.size() > block ? DigestEngine::hash(m_key, algorithm) : m_key;
     key.append(QByteArray(block - key.size(), '\0'));
 
     m_outerPad = xored(key, 0x5c);
-    m_hash.reset(new QCryptographicHash(algorithm));
+    m_hash = std::make_unique<DigestEngine>(algorithm);
     m_hash->addData(xored(key, 0x36));
 }
 
 QByteArray MessageAuthenticationCode::digest() const
 {
-    QCryptographicHash outer { QCryptographicHash::Algorithm(m_algorithm) };
+    DigestEngine outer { QCryptographicHash::Algorithm(m_algorithm) };
     outer.addData(m_outerPad);
     outer.addData(m_hash->result());
     return outer.result();

@@ -6,25 +6,92 @@
 #include <QJSValue>
 #include <QMetaMethod>
 #include <QMetaProperty>
+#include <QRandomGenerator>
 
 namespace {
-
-bool readJsonFile(QIODevice &device, QSettings::SettingsMap &map)
-{
-    // An empty or damaged file is an empty store, not an error.
-    map = JsonUtility::fromString(QString::fromUtf8(device.readAll()));
-    return true;
-}
-
-bool writeJsonFile(QIODevice &device, const QSettings::SettingsMap &map)
-{
-    const QByteArray json = JsonUtility::toJson(map);
-    return device.write(json) >= json.size();
-}
 
 bool isBlankString(const QVariant &value)
 {
     return value.userType() == QMetaType::QString && value.toString().trimmed().isEmpty();
+}
+
+// Integers beyond 2^53 that QJsonDocument would write through a double.
+bool isWideInteger(const QVariant &value)
+{
+    constexpr qint64 exact = qint64(1) << 53;
+    switch (value.userType()) {
+    case QMetaType::LongLong:
+    case QMetaType::Long: {
+        const qint64 n = value.toLongLong();
+        return n > exact || n < -exact;
+    }
+    case QMetaType::ULongLong:
+    case QMetaType::ULong:
+        return value.toULongLong() > quint64(exact);
+    default:
+        return false;
+    }
+}
+
+// Swaps each wide integer for a marker string, prefix + index + "\x01",
+// noting its digits. Returns false if any text holds the prefix itself.
+bool markWideIntegers(QVariant &value, const QString &prefix, QStringList &digits)
+{
+    switch (value.userType()) {
+    case QMetaType::QVariantMap: {
+        QVariantMap map = value.toMap();
+        for (auto it = map.begin(); it != map.end(); ++it) {
+            if (it.key().contains(prefix) || !markWideIntegers(it.value(), prefix, digits))
+                return false;
+        }
+        value = map;
+        return true;
+    }
+    case QMetaType::QVariantList: {
+        QVariantList list = value.toList();
+        for (QVariant &element : list) {
+            if (!markWideIntegers(element, prefix, digits))
+                return false;
+        }
+        value = list;
+        return true;
+    }
+    case QMetaType::QString:
+        return !value.toString().contains(prefix);
+    case QMetaType::QStringList:
+        return !value.toStringList().join(QChar(1)).contains(prefix);
+    default:
+        if (isWideInteger(value)) {
+            digits.append(value.userType() == QMetaType::ULongLong || value.userType() == QMetaType::ULong
+                              ? QString::number(value.toULongLong()) : QString::number(value.toLongLong()));
+            value = QString(prefix + QString::number(digits.size() - 1) + QChar(1));
+        }
+        return true;
+    }
+}
+
+// JSON text of the store. QJsonDocument writes integers through a double,
+// which would change every integer beyond 2^53 in the file at each save;
+// those are written with all their digits instead, by way of marker strings
+// with a random prefix that no text in the store contains.
+QByteArray settingsJson(const QSettings::SettingsMap &map)
+{
+    for (int attempt = 0; attempt < 8; ++attempt) {
+        const QString nonce = QString::number(QRandomGenerator::global()->generate64(), 36);
+        const QString prefix = QChar(1) + nonce + QLatin1Char(':');
+        QVariant marked(map);
+        QStringList digits;
+        if (!markWideIntegers(marked, prefix, digits))
+            continue;
+        if (digits.isEmpty())
+            break;
+        QByteArray json = JsonUtility::toJson(marked.toMap());
+        const QByteArray escapedPrefix = "\"\\u0001" + nonce.toLatin1() + ':';
+        for (int i = 0; i < digits.size(); ++i)
+            json.replace(escapedPrefix + QByteArray::number(i) + "\\u0001\"", digits.at(i).toLatin1());
+        return json;
+    }
+    return JsonUtility::toJson(map);
 }
 
 QString colorText(const QColor &color)
@@ -57,11 +124,24 @@ Settings::Settings(const QString &fileName, QSettings::Format format, QObject *p
 {
 }
 
+bool Settings::readJson(QIODevice &device, QSettings::SettingsMap &map)
+{
+    // An empty or damaged file is an empty store, not an error.
+    map = JsonUtility::fromString(QString::fromUtf8(device.readAll()));
+    return true;
+}
+
+bool Settings::writeJson(QIODevice &device, const QSettings::SettingsMap &map)
+{
+    const QByteArray json = settingsJson(map);
+    return device.write(json) >= json.size();
+}
+
 QSettings::Format Settings::jsonFormat()
 {
     static QSettings::Format format = QSettings::InvalidFormat;
     if (format <= QSettings::InvalidFormat)
-        format = QSettings::registerFormat(QStringLiteral("json"), readJsonFile, writeJsonFile, Qt::CaseSensitive);
+        format = QSettings::registerFormat(QStringLiteral("json"), readJson, writeJson, Qt::CaseSensitive);
     qCDebug(lcFile) << Q_FUNC_INFO << "Format" << format;
     return format;
 }

@@ -24,6 +24,9 @@ public:
 
     // The "json" format: one JSON object whose keys are the settings keys.
     static QSettings::Format jsonFormat();
+    // The format's read and write functions.
+    static bool readJson(QIODevice &device, QSettings::SettingsMap &map);
+    static bool writeJson(QIODevice &device, const QSettings::SettingsMap &map);
 
     // When set, each change is written to disk at once.
     bool autoSync() const { return m_autoSync; }

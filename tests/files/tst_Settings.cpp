@@ -53,6 +53,7 @@ private slots:
     void jsonFileIsJson();
     void damagedJsonIsEmpty_data();
     void damagedJsonIsEmpty();
+    void wideIntegersKeepTheirDigits();
     void colors_data();
     void colors();
     void typedValues();
@@ -219,6 +220,38 @@ void tst_Settings::damagedJsonIsEmpty()
     QVERIFY(file.open(QIODevice::ReadOnly));
     QCOMPARE(QJsonDocument::fromJson(file.readAll()).object().value(QStringLiteral("k")).toString(),
              QStringLiteral("v"));
+}
+
+void tst_Settings::wideIntegersKeepTheirDigits()
+{
+    // Found by fuzzing: each save rewrote integers beyond 2^53 through a double.
+    const QString path = m_dir.filePath(QStringLiteral("wide.json"));
+    QFile file(path);
+    QVERIFY(file.open(QIODevice::WriteOnly));
+    file.write("{\"big\": 2222222222222222221, \"list\": [-9007199254740993, 1], \"small\": 5}");
+    file.close();
+
+    const qint64 wide = (qint64(1) << 60) + 1;
+    {
+        Settings settings(path, Settings::jsonFormat());
+        settings.setValue(QStringLiteral("id"), wide);
+        settings.setValue(QStringLiteral("marker"), QString(QChar(1)) + QStringLiteral("0") + QChar(1));
+    }
+    QVERIFY(file.open(QIODevice::ReadOnly));
+    const QByteArray json = file.readAll();
+    file.close();
+    QVERIFY2(json.contains("2222222222222222221"), json.constData());
+    QVERIFY(json.contains("-9007199254740993"));
+    QVERIFY(json.contains(QByteArray::number(wide)));
+
+    Settings settings(path, Settings::jsonFormat());
+    QCOMPARE(settings.value(QStringLiteral("big")).toLongLong(), 2222222222222222221LL);
+    QCOMPARE(settings.value(QStringLiteral("id")).toLongLong(), wide);
+    QCOMPARE(settings.value(QStringLiteral("list")).toList().value(0).toLongLong(), -9007199254740993LL);
+    QCOMPARE(settings.value(QStringLiteral("small")).toInt(), 5);
+    // Text that looks like the internal marker is kept as it was.
+    QCOMPARE(settings.value(QStringLiteral("marker")).toString(),
+             QString(QChar(1)) + QStringLiteral("0") + QChar(1));
 }
 
 void tst_Settings::colors_data()
