@@ -110,7 +110,7 @@ bool JpegMarkers::write(JpegMarkerType type, const QByteArray &data)
 
 void JpegMarkers::raiseError(const QString &message)
 {
-    qCDebug(lcFile) << Q_FUNC_INFO << message;
+    qCDebug(lcFile).noquote() << Q_FUNC_INFO << message;
 }
 
 bool JpegMarkers::readMarker()
