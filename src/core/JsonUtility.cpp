@@ -1,4 +1,5 @@
 #include "JsonUtility.h"
+#include "FileFolder.h"
 #include "LoomkitLogging.h"
 
 #include <QFile>
@@ -145,11 +146,5 @@ QByteArray JsonUtility::toJson(const QVariantMap &map)
 
 bool JsonUtility::toFile(const QString &path, const QVariantMap &map)
 {
-    const QByteArray bytes = toJson(map);
-    QFile file(path);
-    if (!file.open(QIODevice::WriteOnly | QIODevice::Truncate)) {
-        qCWarning(lcUtility) << Q_FUNC_INFO << "Error opening" << path << file.errorString();
-        return false;
-    }
-    return file.write(bytes) >= bytes.size();
+    return FileFolder::writeFileData(path, toJson(map));
 }

@@ -1,6 +1,11 @@
 #include "Loomkit.h"
+#include "Environment.h"
+#include "File.h"
+#include "FileFolder.h"
+#include "FileInfo.h"
 #include "FileUtility.h"
 #include "LoomkitLogging.h"
+#include "StandardPaths.h"
 #include "platform/AppUtilsPrivate.h"
 
 #include <QClipboard>
@@ -737,4 +742,73 @@ bool Loomkit::isAppInstalled(const QStringList &appIdentifierValues)
             return true;
     }
     return false;
+}
+
+// Files, folders, storage and the environment
+
+FileFolder *Loomkit::userHomeFolder()
+{
+    // A new object at each read, as a property value: no parent, and the
+    // engine does not take it over.
+    return new FileFolder(userHomePath());
+}
+
+FileFolder *Loomkit::temporaryFolder() const
+{
+    return new FileFolder(QDir::temp());
+}
+
+StandardPaths *Loomkit::standardPaths()
+{
+    if (!m_standardPaths)
+        m_standardPaths = new StandardPaths(this);
+    return m_standardPaths;
+}
+
+Environment *Loomkit::environment()
+{
+    if (!m_environment)
+        m_environment = new Environment(this);
+    return m_environment;
+}
+
+namespace {
+
+template <typename T>
+T *scriptOwned(T *object)
+{
+    QQmlEngine::setObjectOwnership(object, QQmlEngine::JavaScriptOwnership);
+    return object;
+}
+
+} // namespace
+
+File *Loomkit::file(const QString &path)
+{
+    return scriptOwned(new File(path));
+}
+
+File *Loomkit::file(const QUrl &pathUrl)
+{
+    return scriptOwned(new File(pathUrl));
+}
+
+FileFolder *Loomkit::fileFolder(const QString &path)
+{
+    return scriptOwned(new FileFolder(path));
+}
+
+FileFolder *Loomkit::fileFolder(const QUrl &pathUrl)
+{
+    return scriptOwned(new FileFolder(pathUrl));
+}
+
+FileInfo *Loomkit::fileInfo(const QString &path)
+{
+    return scriptOwned(new FileInfo(path));
+}
+
+FileInfo *Loomkit::fileInfo(const QUrl &pathUrl)
+{
+    return scriptOwned(new FileInfo(pathUrl));
 }

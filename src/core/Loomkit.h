@@ -11,6 +11,12 @@
 #include <QVariant>
 #include <QVariantMap>
 
+#include "Environment.h"
+#include "File.h"
+#include "FileFolder.h"
+#include "FileInfo.h"
+#include "StandardPaths.h"
+
 class QQmlEngine;
 class QQuickItem;
 class QQuickWindow;
@@ -42,6 +48,12 @@ class Loomkit : public QObject
     Q_PROPERTY(QString defaultLocale READ defaultLocale WRITE setDefaultLocale NOTIFY defaultLocaleChanged)
     Q_PROPERTY(QStringList availableLocaleNames READ availableLocaleNames CONSTANT)
     Q_PROPERTY(QString systemLocale READ systemLocale CONSTANT)
+
+    // Files, folders, storage and the environment
+    Q_PROPERTY(FileFolder *userHomeFolder READ userHomeFolder NOTIFY userHomePathChanged)
+    Q_PROPERTY(FileFolder *temporaryFolder READ temporaryFolder CONSTANT)
+    Q_PROPERTY(StandardPaths *standardPaths READ standardPaths CONSTANT)
+    Q_PROPERTY(Environment *environment READ environment CONSTANT)
 
 public:
     explicit Loomkit(QObject *parent = nullptr);
@@ -110,6 +122,18 @@ public:
     Q_INVOKABLE bool isAppInstalled(const QString &appIdentifier);
     Q_INVOKABLE bool isAppInstalled(const QStringList &appIdentifierValues);
 
+    // Files, folders, storage and the environment
+    FileFolder *userHomeFolder();
+    FileFolder *temporaryFolder() const;
+    StandardPaths *standardPaths();
+    Environment *environment();
+    Q_INVOKABLE File *file(const QString &path);
+    Q_INVOKABLE File *file(const QUrl &pathUrl);
+    Q_INVOKABLE FileFolder *fileFolder(const QString &path);
+    Q_INVOKABLE FileFolder *fileFolder(const QUrl &pathUrl);
+    Q_INVOKABLE FileInfo *fileInfo(const QString &path);
+    Q_INVOKABLE FileInfo *fileInfo(const QUrl &pathUrl);
+
 signals:
     void userHomePathChanged();
     void offlineStoragePathChanged();
@@ -132,6 +156,8 @@ private:
     double m_displayScaleFactor = 0;
     QStringList m_availableLocaleNames;
     AppUtilsPrivate *m_appUtils = nullptr;
+    Environment *m_environment = nullptr;
+    StandardPaths *m_standardPaths = nullptr;
 };
 
 #endif // LOOMKIT_H

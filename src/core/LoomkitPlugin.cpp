@@ -1,8 +1,14 @@
 #include "LoomkitPlugin.h"
+#include "Environment.h"
+#include "File.h"
+#include "FileFolder.h"
+#include "FileInfo.h"
 #include "Loomkit.h"
 #include "LoomkitError.h"
 #include "LoomkitLogging.h"
 #include "LoomkitObject.h"
+#include "StandardPaths.h"
+#include "StorageInfo.h"
 
 #include <QCoreApplication>
 #include <QLocale>
@@ -49,6 +55,13 @@ void LoomkitPlugin::registerTypes(const char *uri)
     qmlRegisterSingletonType<Loomkit>(uri, 1, 0, "Loomkit", &LoomkitPlugin::loomkitProvider);
     registerUncreatable<LoomkitObject>(uri, "LoomkitObject", "The Orvane type LoomkitObject is not creatable");
     registerUncreatable<LoomkitError>(uri, "LoomkitError", "The Orvane type LoomkitError is not creatable");
+    registerUncreatable<Environment>(uri, "Environment", "The Orvane type Environment is not creatable");
+    qmlRegisterType<File>(uri, 1, 0, "File");
+    qmlRegisterType<FileInfo>(uri, 1, 0, "FileInfo");
+    qmlRegisterType<FileFolder>(uri, 1, 0, "FileFolder");
+    qmlRegisterType<StorageInfo>(uri, 1, 0, "StorageInfo");
+    registerUncreatable<StandardPaths>(uri, "StandardPaths", "The Orvane type StandardPaths is not creatable");
+    qRegisterMetaType<StorageInfo::StorageType>("StorageInfo::StorageType");
 }
 
 void LoomkitPlugin::initializeNetwork()
