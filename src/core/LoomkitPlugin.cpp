@@ -1,8 +1,10 @@
 #include "LoomkitPlugin.h"
 #include "Environment.h"
+#include "ExifInfo.h"
 #include "File.h"
 #include "FileFolder.h"
 #include "FileInfo.h"
+#include "ImageAttributes.h"
 #include "Loomkit.h"
 #include "LoomkitError.h"
 #include "LoomkitLogging.h"
@@ -59,6 +61,8 @@ void LoomkitPlugin::registerTypes(const char *uri)
     qmlRegisterType<File>(uri, 1, 0, "File");
     qmlRegisterType<FileInfo>(uri, 1, 0, "FileInfo");
     qmlRegisterType<FileFolder>(uri, 1, 0, "FileFolder");
+    qmlRegisterType<ExifInfo>(uri, 1, 0, "ExifInfo");
+    qmlRegisterType<ImageAttributes>(uri, 1, 0, "ImageAttributes");
     qmlRegisterType<StorageInfo>(uri, 1, 0, "StorageInfo");
     registerUncreatable<StandardPaths>(uri, "StandardPaths", "The Orvane type StandardPaths is not creatable");
     qRegisterMetaType<StorageInfo::StorageType>("StorageInfo::StorageType");
