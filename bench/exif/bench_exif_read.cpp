@@ -1,4 +1,5 @@
-// Reads every tag of every file given and prints "group.name value" lines.
+// Reads every tag of every file given and prints "group.name value" lines,
+// as exiv2 -pa and exiftool -s print theirs.
 // Reports on stderr the files per second of the loop itself.
 #include "ExifInfo.h"
 #include "QExifImageHeader.h"
@@ -12,30 +13,61 @@
 
 namespace {
 
-QByteArray text(const QVariant &value)
+// A value as text, the way a dump tool prints it: numbers, fractions, the
+// string, or the bytes in hexadecimal.
+void appendValue(QByteArray &out, const QExifValue &value)
 {
-    if (value.userType() == QMetaType::QVariantList) {
-        QByteArray out;
-        for (const QVariant &element : value.toList()) {
-            if (!out.isEmpty())
+    const auto join = [&out](const auto &vector, auto format) {
+        for (int i = 0; i < vector.size(); ++i) {
+            if (i)
                 out += ' ';
-            out += element.toString().toUtf8();
+            format(vector.at(i));
         }
-        return out;
+    };
+    const auto number = [&out](qint64 n) { out += QByteArray::number(n); };
+    const auto fraction = [&out](const auto &r) {
+        out += QByteArray::number(qint64(r.first));
+        out += '/';
+        out += QByteArray::number(qint64(r.second));
+    };
+    switch (value.type()) {
+    case QExifValue::Ascii:
+        out += value.toString().toUtf8();
+        break;
+    case QExifValue::Undefined:
+        out += value.toByteArray().left(64).toHex(' ');
+        break;
+    case QExifValue::Byte:
+        join(value.toByteVector(), number);
+        break;
+    case QExifValue::Short:
+        join(value.toShortVector(), number);
+        break;
+    case QExifValue::Long:
+        join(value.toLongVector(), number);
+        break;
+    case QExifValue::SignedLong:
+        join(value.toSignedLongVector(), number);
+        break;
+    case QExifValue::Rational:
+        join(value.toRationalVector(), fraction);
+        break;
+    case QExifValue::SignedRational:
+        join(value.toSignedRationalVector(), fraction);
+        break;
+    default:
+        break;
     }
-    if (value.userType() == QMetaType::QByteArray)
-        return value.toByteArray().toHex(' ');
-    return value.toString().toUtf8();
 }
 
-void print(QByteArray &out, const char *group, const QMetaEnum &names, int tag, const QVariant &value)
+void print(QByteArray &out, const char *group, const QMetaEnum &names, int tag, const QExifValue &value)
 {
     out += group;
     out += '.';
     const char *name = names.valueToKey(tag);
     out += name ? QByteArray(name) : QByteArray::number(tag);
     out += ' ';
-    out += text(value);
+    appendValue(out, value);
     out += '\n';
 }
 
@@ -64,11 +96,11 @@ int main(int argc, char **argv)
         out += file.toUtf8();
         out += '\n';
         for (int tag : header.imageTags())
-            print(out, "Image", imageNames, tag, ExifInfo::toVariant(header.imageValue(tag)));
+            print(out, "Image", imageNames, tag, header.imageValue(tag));
         for (int tag : header.extendedTags())
-            print(out, "Extended", extendedNames, tag, ExifInfo::toVariant(header.extendedValue(tag)));
+            print(out, "Extended", extendedNames, tag, header.extendedValue(tag));
         for (int tag : header.gpsTags())
-            print(out, "Gps", gpsNames, tag, ExifInfo::toVariant(header.gpsValue(tag)));
+            print(out, "Gps", gpsNames, tag, header.gpsValue(tag));
         tags += header.imageTags().size() + header.extendedTags().size() + header.gpsTags().size();
         if (out.size() > (1 << 20)) {
             fwrite(out.constData(), 1, size_t(out.size()), stdout);
