@@ -180,7 +180,7 @@ void ImageAttributes::setDestFileUrl(const QUrl &destFileUrl)
 QVariant ImageAttributes::keys()
 {
     QFile file(m_filePath);
-    if (!file.open(QIODevice::ReadOnly))
+    if (m_filePath.isEmpty() || !file.open(QIODevice::ReadOnly))
         return QVariant();
 
     QStringList keys;
@@ -325,7 +325,7 @@ QVariantMap ImageAttributes::read(const QStringList &keys, bool wildcard, bool r
 {
     QVariantMap result;
     QFile file(m_filePath);
-    if (!file.open(QIODevice::ReadOnly))
+    if (m_filePath.isEmpty() || !file.open(QIODevice::ReadOnly))
         return result;
 
     JpegMarkers markers(&file);
@@ -360,7 +360,7 @@ QVariantMap ImageAttributes::read(const QStringList &keys, bool wildcard, bool r
 bool ImageAttributes::write(const QVariantMap &values, bool wildcard)
 {
     QFile source(m_filePath);
-    if (!source.open(QIODevice::ReadOnly))
+    if (m_filePath.isEmpty() || !source.open(QIODevice::ReadOnly))
         return false;
 
     QString targetPath = m_destFilePath.isEmpty() ? m_filePath : m_destFilePath;

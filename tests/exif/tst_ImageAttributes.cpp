@@ -473,6 +473,10 @@ void tst_ImageAttributes::stillAJpegForOtherTools()
 void tst_ImageAttributes::properties()
 {
     ImageAttributes attributes;
+    // No file yet: empty results.
+    QVERIFY(!attributes.keys().isValid());
+    QVERIFY(attributes.values().isEmpty());
+    QVERIFY(!attributes.setValue(QStringLiteral("k"), 1));
     QCOMPARE(attributes.appMarker(), 65514);
     QCOMPARE(attributes.signature(), QStringLiteral("ZETH"));
     QCOMPARE(attributes.version(), ushort(1282));
