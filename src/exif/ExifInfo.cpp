@@ -469,16 +469,12 @@ QVariant ExifInfo::imageValue(ImageTag tag) const
 
 void ExifInfo::setImageValue(ImageTag tag, const QVariant &value)
 {
-    m_header.setImageValue(tag, toExifValue(plainVariant(value), imageConversion(tag)));
-    m_valid = true;
-    emit exifChanged();
+    setValue(QExifImageHeader::ImageGroup, tag, toExifValue(plainVariant(value), imageConversion(tag)));
 }
 
 void ExifInfo::removeImageValue(ImageTag tag)
 {
-    m_header.removeImageValue(tag);
-    m_valid = true;
-    emit exifChanged();
+    removeValue(QExifImageHeader::ImageGroup, tag);
 }
 
 QString ExifInfo::imageTagName(ImageTag tag) const
@@ -488,23 +484,17 @@ QString ExifInfo::imageTagName(ImageTag tag) const
 
 QVariant ExifInfo::extendedValue(ExtendedTag tag) const
 {
-    if (!m_header.containsExtendedTag(tag))
-        return QVariant();
-    return toVariant(m_header.extendedValue(tag));
+    return groupValue(QExifImageHeader::ExtendedGroup, tag);
 }
 
 void ExifInfo::setExtendedValue(ExtendedTag tag, const QVariant &value)
 {
-    m_header.setExtendedValue(tag, toExifValue(plainVariant(value), extendedConversion(tag)));
-    m_valid = true;
-    emit exifChanged();
+    setValue(QExifImageHeader::ExtendedGroup, tag, toExifValue(plainVariant(value), extendedConversion(tag)));
 }
 
 void ExifInfo::removeExtendedValue(ExtendedTag tag)
 {
-    m_header.removeExtendedValue(tag);
-    m_valid = true;
-    emit exifChanged();
+    removeValue(QExifImageHeader::ExtendedGroup, tag);
 }
 
 QString ExifInfo::extendedTagName(ExtendedTag tag) const
@@ -514,28 +504,44 @@ QString ExifInfo::extendedTagName(ExtendedTag tag) const
 
 QVariant ExifInfo::gpsValue(GpsTag tag) const
 {
-    if (!m_header.containsGpsTag(tag))
-        return QVariant();
-    return toVariant(m_header.gpsValue(tag));
+    return groupValue(QExifImageHeader::GpsGroup, tag);
 }
 
 void ExifInfo::setGpsValue(GpsTag tag, const QVariant &value)
 {
-    m_header.setGpsValue(tag, toExifValue(plainVariant(value), gpsConversion(tag)));
-    m_valid = true;
-    emit exifChanged();
+    setValue(QExifImageHeader::GpsGroup, tag, toExifValue(plainVariant(value), gpsConversion(tag)));
 }
 
 void ExifInfo::removeGpsValue(GpsTag tag)
 {
-    m_header.removeGpsValue(tag);
-    m_valid = true;
-    emit exifChanged();
+    removeValue(QExifImageHeader::GpsGroup, tag);
 }
 
 QString ExifInfo::gpsTagName(GpsTag tag) const
 {
     return tagName("GpsTag", tag);
+}
+
+QVariant ExifInfo::groupValue(QExifImageHeader::Group group, int tag) const
+{
+    if (!m_header.contains(group, tag))
+        return QVariant();
+    return toVariant(m_header.value(group, tag));
+}
+
+// Every change, also to nothing, makes the data valid: it can be saved.
+void ExifInfo::setValue(QExifImageHeader::Group group, int tag, const QExifValue &value)
+{
+    m_header.setValue(group, tag, value);
+    m_valid = true;
+    emit exifChanged();
+}
+
+void ExifInfo::removeValue(QExifImageHeader::Group group, int tag)
+{
+    m_header.remove(group, tag);
+    m_valid = true;
+    emit exifChanged();
 }
 
 bool ExifInfo::load(const QString &filePath)

@@ -287,6 +287,9 @@ signals:
 
 private:
     void loadResolvedPath(const QString &resolvedPath);
+    QVariant groupValue(QExifImageHeader::Group group, int tag) const;
+    void setValue(QExifImageHeader::Group group, int tag, const QExifValue &value);
+    void removeValue(QExifImageHeader::Group group, int tag);
 
     QExifImageHeader m_header;
     bool m_valid = false;

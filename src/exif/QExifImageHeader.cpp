@@ -20,6 +20,17 @@ public:
     QExifValue thumbnailYResolution;
     QExifValue thumbnailResolutionUnit;
     QExifValue thumbnailOrientation;
+
+    QMap<int, QExifValue> &group(QExifImageHeader::Group group)
+    {
+        return group == QExifImageHeader::ImageGroup      ? imageIfdValues
+               : group == QExifImageHeader::ExtendedGroup ? extendedIfdValues
+                                                          : gpsIfdValues;
+    }
+    const QMap<int, QExifValue> &group(QExifImageHeader::Group group) const
+    {
+        return const_cast<QExifImageHeaderPrivate *>(this)->group(group);
+    }
 };
 
 namespace {
@@ -728,79 +739,29 @@ qint64 QExifImageHeader::size() const
     return d->size;
 }
 
-QList<int> QExifImageHeader::imageTags() const
+QList<int> QExifImageHeader::tags(Group group) const
 {
-    return d->imageIfdValues.keys();
+    return d->group(group).keys();
 }
 
-bool QExifImageHeader::containsImageTag(int tag) const
+bool QExifImageHeader::contains(Group group, int tag) const
 {
-    return d->imageIfdValues.contains(tag);
+    return d->group(group).contains(tag);
 }
 
-QExifValue QExifImageHeader::imageValue(int tag) const
+QExifValue QExifImageHeader::value(Group group, int tag) const
 {
-    return d->imageIfdValues.value(tag);
+    return d->group(group).value(tag);
 }
 
-void QExifImageHeader::setImageValue(int tag, const QExifValue &value)
+void QExifImageHeader::setValue(Group group, int tag, const QExifValue &value)
 {
-    d->imageIfdValues.insert(tag, value);
+    d->group(group).insert(tag, value);
 }
 
-void QExifImageHeader::removeImageValue(int tag)
+void QExifImageHeader::remove(Group group, int tag)
 {
-    d->imageIfdValues.remove(tag);
-}
-
-QList<int> QExifImageHeader::extendedTags() const
-{
-    return d->extendedIfdValues.keys();
-}
-
-bool QExifImageHeader::containsExtendedTag(int tag) const
-{
-    return d->extendedIfdValues.contains(tag);
-}
-
-QExifValue QExifImageHeader::extendedValue(int tag) const
-{
-    return d->extendedIfdValues.value(tag);
-}
-
-void QExifImageHeader::setExtendedValue(int tag, const QExifValue &value)
-{
-    d->extendedIfdValues.insert(tag, value);
-}
-
-void QExifImageHeader::removeExtendedValue(int tag)
-{
-    d->extendedIfdValues.remove(tag);
-}
-
-QList<int> QExifImageHeader::gpsTags() const
-{
-    return d->gpsIfdValues.keys();
-}
-
-bool QExifImageHeader::containsGpsTag(int tag) const
-{
-    return d->gpsIfdValues.contains(tag);
-}
-
-QExifValue QExifImageHeader::gpsValue(int tag) const
-{
-    return d->gpsIfdValues.value(tag);
-}
-
-void QExifImageHeader::setGpsValue(int tag, const QExifValue &value)
-{
-    d->gpsIfdValues.insert(tag, value);
-}
-
-void QExifImageHeader::removeGpsValue(int tag)
-{
-    d->gpsIfdValues.remove(tag);
+    d->group(group).remove(tag);
 }
 
 QByteArray QExifImageHeader::thumbnailData() const

@@ -56,23 +56,32 @@ public:
     void setByteOrder(QDataStream::ByteOrder byteOrder);
     qint64 size() const;
 
-    QList<int> imageTags() const;
-    bool containsImageTag(int tag) const;
-    QExifValue imageValue(int tag) const;
-    void setImageValue(int tag, const QExifValue &value);
-    void removeImageValue(int tag);
+    // The three tag maps: IFD0, the Exif IFD and the GPS IFD.
+    enum Group { ImageGroup, ExtendedGroup, GpsGroup };
 
-    QList<int> extendedTags() const;
-    bool containsExtendedTag(int tag) const;
-    QExifValue extendedValue(int tag) const;
-    void setExtendedValue(int tag, const QExifValue &value);
-    void removeExtendedValue(int tag);
+    QList<int> tags(Group group) const;
+    bool contains(Group group, int tag) const;
+    QExifValue value(Group group, int tag) const;
+    void setValue(Group group, int tag, const QExifValue &value);
+    void remove(Group group, int tag);
 
-    QList<int> gpsTags() const;
-    bool containsGpsTag(int tag) const;
-    QExifValue gpsValue(int tag) const;
-    void setGpsValue(int tag, const QExifValue &value);
-    void removeGpsValue(int tag);
+    QList<int> imageTags() const { return tags(ImageGroup); }
+    bool containsImageTag(int tag) const { return contains(ImageGroup, tag); }
+    QExifValue imageValue(int tag) const { return value(ImageGroup, tag); }
+    void setImageValue(int tag, const QExifValue &value) { setValue(ImageGroup, tag, value); }
+    void removeImageValue(int tag) { remove(ImageGroup, tag); }
+
+    QList<int> extendedTags() const { return tags(ExtendedGroup); }
+    bool containsExtendedTag(int tag) const { return contains(ExtendedGroup, tag); }
+    QExifValue extendedValue(int tag) const { return value(ExtendedGroup, tag); }
+    void setExtendedValue(int tag, const QExifValue &value) { setValue(ExtendedGroup, tag, value); }
+    void removeExtendedValue(int tag) { remove(ExtendedGroup, tag); }
+
+    QList<int> gpsTags() const { return tags(GpsGroup); }
+    bool containsGpsTag(int tag) const { return contains(GpsGroup, tag); }
+    QExifValue gpsValue(int tag) const { return value(GpsGroup, tag); }
+    void setGpsValue(int tag, const QExifValue &value) { setValue(GpsGroup, tag, value); }
+    void removeGpsValue(int tag) { remove(GpsGroup, tag); }
 
     QByteArray thumbnailData() const;
     void setThumbnailData(const QByteArray &data);

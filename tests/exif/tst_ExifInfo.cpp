@@ -15,19 +15,11 @@ Q_DECLARE_METATYPE(QExifURational)
 
 namespace {
 
-enum Group { Image, Extended, Gps };
+enum Group { Image = QExifImageHeader::ImageGroup, Extended = QExifImageHeader::ExtendedGroup, Gps = QExifImageHeader::GpsGroup };
 
 QExifValue stored(ExifInfo &info, Group group, int tag)
 {
-    switch (group) {
-    case Image:
-        return info.header().imageValue(tag);
-    case Extended:
-        return info.header().extendedValue(tag);
-    case Gps:
-        return info.header().gpsValue(tag);
-    }
-    return QExifValue();
+    return info.header().value(QExifImageHeader::Group(group), tag);
 }
 
 void store(ExifInfo &info, Group group, int tag, const QVariant &value)
