@@ -5,7 +5,7 @@
 
 #include <QDateTime>
 #include <QJSValue>
-#include <QRegExp>
+#include <QRegularExpression>
 #include <QTextCodec>
 
 #include <algorithm>
@@ -206,9 +206,10 @@ QExifValue numberValue(const QVariant &input, int size)
 {
     QVariant value = input;
     if (value.userType() == QMetaType::QString) {
-        static const QRegExp digits(QStringLiteral("^(\\d)(,\\d)*$"));
+        // QRegularExpression matches from a const object: safe on any thread.
+        static const QRegularExpression digits(QStringLiteral("^(\\d)(,\\d)*\\z"));
         const QString text = value.toString();
-        if (digits.exactMatch(text)) {
+        if (digits.match(text).hasMatch()) {
             // The digits go on as text, which the loop below can't take.
             QVariantList list;
             for (const QString &digit : text.split(QLatin1Char(',')))
@@ -755,9 +756,10 @@ QExifValue ExifInfo::toExifValueUndefined(const QVariant &value, int size)
 QVariant ExifInfo::toVariant(const QExifValue &value)
 {
     if (value.type() == QExifValue::Ascii) {
-        static const QRegExp dateTime(QStringLiteral("^([\\d]{4}):([\\d]{2}):([\\d]{2}) ([\\d]{2}):([\\d]{2}):([\\d]{2})$"));
+        static const QRegularExpression dateTime(
+            QStringLiteral("^([\\d]{4}):([\\d]{2}):([\\d]{2}) ([\\d]{2}):([\\d]{2}):([\\d]{2})\\z"));
         const QString text = value.toString();
-        if (dateTime.exactMatch(text))
+        if (dateTime.match(text).hasMatch())
             return QDateTime::fromString(text, QLatin1String(exifDateFormat));
         return text;
     }

@@ -257,6 +257,8 @@ void tst_ExifInfo::toVariant_data()
                                << QVariant(QDateTime(QDate(2024, 5, 6), QTime(7, 8, 9)));
     QTest::newRow("not quite a date") << QExifValue(QStringLiteral("2024:05:06 07:08:09 "))
                                       << QVariant(QStringLiteral("2024:05:06 07:08:09 "));
+    QTest::newRow("date and a line feed") << QExifValue(QStringLiteral("2024:05:06 07:08:09\n"))
+                                          << QVariant(QStringLiteral("2024:05:06 07:08:09\n"));
     QTest::newRow("undefined") << QExifValue(QByteArray("0230")) << QVariant(QByteArray("0230"));
     QTest::newRow("byte") << QExifValue(quint8(200)) << QVariant(200);
     QTest::newRow("short") << QExifValue(quint16(65535)) << QVariant(65535);
