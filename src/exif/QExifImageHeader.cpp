@@ -432,6 +432,74 @@ bool writeFully(QIODevice *device, const QByteArray &data)
     return device->write(data) == data.size();
 }
 
+// Reads a device from its position on. A device that can seek is read in
+// windows of at least a page at the places asked for, so that the segments
+// stepped over are never read; a sequential one is read as it comes.
+class SegmentSource
+{
+public:
+    explicit SegmentSource(QIODevice *device)
+        : m_device(device)
+        , m_random(!device->isSequential())
+        , m_position(device->pos())
+        , m_size(m_random ? device->size() : -1)
+    {
+    }
+
+    bool take(uchar *data, int length)
+    {
+        if (!m_random)
+            return readFully(m_device, reinterpret_cast<char *>(data), length);
+        if (!fetch(length))
+            return false;
+        memcpy(data, m_window.constData() + (m_position - m_windowStart), size_t(length));
+        m_position += length;
+        return true;
+    }
+
+    bool skip(qint64 length)
+    {
+        if (!m_random)
+            return m_device->skip(length) == length;
+        if (m_position + length > m_size)
+            return false;
+        m_position += length;
+        return true;
+    }
+
+    // Up to length bytes: fewer where the device ends first.
+    QByteArray takeUpTo(qint64 length)
+    {
+        if (!m_random)
+            return m_device->read(length);
+        length = qMin(length, m_size - m_position);
+        if (length <= 0 || !fetch(length))
+            return QByteArray();
+        const QByteArray bytes = m_window.mid(int(m_position - m_windowStart), int(length));
+        m_position += length;
+        return bytes;
+    }
+
+private:
+    bool fetch(qint64 length)
+    {
+        if (m_position >= m_windowStart && m_position + length <= m_windowStart + m_window.size())
+            return true;
+        if (m_position + length > m_size || !m_device->seek(m_position))
+            return false;
+        m_window = m_device->read(qMax<qint64>(length, 4096));
+        m_windowStart = m_position;
+        return m_window.size() >= length;
+    }
+
+    QIODevice *m_device;
+    bool m_random;
+    qint64 m_position;
+    qint64 m_size;
+    QByteArray m_window;
+    qint64 m_windowStart = 0;
+};
+
 QByteArray bigEndian16(quint16 value)
 {
     const char bytes[2] = {char(value >> 8), char(value)};
@@ -458,8 +526,9 @@ void QExifImageHeader::clear()
 
 bool QExifImageHeader::loadFromJpeg(const QString &fileName)
 {
+    // Unbuffered: the reads below ask for what they need, nothing more.
     QFile file(fileName);
-    if (!file.open(QIODevice::ReadOnly)) {
+    if (!file.open(QIODevice::ReadOnly | QIODevice::Unbuffered)) {
         clear();
         return false;
     }
@@ -471,31 +540,31 @@ bool QExifImageHeader::loadFromJpeg(QIODevice *device)
     clear();
     if (!device)
         return false;
+    SegmentSource source(device);
 
     uchar bytes[4];
-    if (!readFully(device, reinterpret_cast<char *>(bytes), 2) || bytes[0] != 0xff || bytes[1] != 0xd8)
+    if (!source.take(bytes, 2) || bytes[0] != 0xff || bytes[1] != 0xd8)
         return false;
 
     // Every segment is skipped by its length up to the first APP1, also past
     // Start of Scan. A length below 2 would step backwards, so it ends the walk.
     quint16 length = 0;
     for (;;) {
-        const qint64 got = device->read(reinterpret_cast<char *>(bytes), 4);
-        if (got < 4)
+        if (!source.take(bytes, 4))
             return false;
         length = get16(bytes + 2, false);
         if (bytes[0] == 0xff && bytes[1] == 0xe1)
             break;
-        if (length < 2 || !skipFully(device, length - 2))
+        if (length < 2 || !source.skip(length - 2))
             return false;
     }
 
-    char signature[6];
-    if (!readFully(device, signature, 4) || memcmp(signature, exifSignature, 4) != 0)
+    uchar signature[6];
+    if (!source.take(signature, 4) || memcmp(signature, exifSignature, 4) != 0)
         return false;
-    if (length <= 8 || !readFully(device, signature + 4, 2))
+    if (length <= 8 || !source.take(signature + 4, 2))
         return false;
-    const QByteArray block = device->read(length - 8);
+    const QByteArray block = source.takeUpTo(length - 8);
     if (block.isEmpty())
         return false;
     return read(block);
