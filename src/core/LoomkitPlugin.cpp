@@ -3,9 +3,11 @@
 #include "BinaryData.h"
 #include "CryptographicHash.h"
 #include "Environment.h"
+#include "ExifInfo.h"
 #include "File.h"
 #include "FileFolder.h"
 #include "FileInfo.h"
+#include "ImageAttributes.h"
 #include "InputValidator.h"
 #include "LocaleInfo.h"
 #include "Loomkit.h"
@@ -91,6 +93,8 @@ void LoomkitPlugin::registerTypes(const char *uri)
     qmlRegisterType<FileInfo>(uri, 1, 0, "FileInfo");
     qmlRegisterType<FileFolder>(uri, 1, 0, "FileFolder");
     qmlRegisterType<Settings>(uri, 1, 0, "Settings");
+    qmlRegisterType<ExifInfo>(uri, 1, 0, "ExifInfo");
+    qmlRegisterType<ImageAttributes>(uri, 1, 0, "ImageAttributes");
     qmlRegisterType<StorageInfo>(uri, 1, 0, "StorageInfo");
     qmlRegisterType<ZipReader>(uri, 1, 0, "ZipReader");
     qmlRegisterType<ZipWriter>(uri, 1, 0, "ZipWriter");

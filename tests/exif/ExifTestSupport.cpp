@@ -1,0 +1,86 @@
+#include "ExifTestSupport.h"
+#include "TestSupport.h"
+
+#include <QDir>
+#include <QFile>
+#include <QImage>
+#include <QJsonArray>
+#include <QJsonDocument>
+
+namespace ExifTestSupport {
+
+bool makeJpeg(const QString &path, int width, int height, const QColor &color)
+{
+    QImage image(width, height, QImage::Format_RGB32);
+    image.fill(color);
+    for (int y = 0; y < height; y += 4)
+        image.setPixel(y % width, y, qRgb(255, 255, 255));
+    return image.save(path, "JPG", 90);
+}
+
+bool exiftoolWrite(const QString &path, const QStringList &arguments)
+{
+    int exitCode = -1;
+    TestSupport::run(QStringLiteral("exiftool"),
+                     QStringList{QStringLiteral("-q"), QStringLiteral("-overwrite_original")} + arguments + QStringList{path},
+                     &exitCode);
+    return exitCode == 0;
+}
+
+QJsonObject exiftoolRead(const QString &path, const QStringList &arguments)
+{
+    int exitCode = -1;
+    const QByteArray output = TestSupport::run(
+        QStringLiteral("exiftool"),
+        QStringList{QStringLiteral("-j"), QStringLiteral("-n"), QStringLiteral("-a"), QStringLiteral("-G1")} + arguments
+            + QStringList{path},
+        &exitCode);
+    const QJsonArray array = QJsonDocument::fromJson(output).array();
+    return array.isEmpty() ? QJsonObject() : array.first().toObject();
+}
+
+QList<Segment> segments(const QByteArray &jpeg, int *sosOffset)
+{
+    QList<Segment> result;
+    int pos = 2;
+    while (pos + 4 <= jpeg.size()) {
+        const quint16 marker = quint16(uchar(jpeg[pos]) << 8 | uchar(jpeg[pos + 1]));
+        if (marker == 0xffda) {
+            if (sosOffset)
+                *sosOffset = pos;
+            return result;
+        }
+        const int length = uchar(jpeg[pos + 2]) << 8 | uchar(jpeg[pos + 3]);
+        result.append(Segment{marker, jpeg.mid(pos + 4, length - 2)});
+        pos += 2 + length;
+    }
+    if (sosOffset)
+        *sosOffset = -1;
+    return result;
+}
+
+QByteArray assemble(const QList<Segment> &segments, const QByteArray &scanAndRest)
+{
+    QByteArray jpeg("\xff\xd8", 2);
+    for (const Segment &segment : segments) {
+        const int length = segment.data.size() + 2;
+        const char head[4] = {char(segment.marker >> 8), char(segment.marker), char(length >> 8), char(length)};
+        jpeg.append(head, 4);
+        jpeg.append(segment.data);
+    }
+    return jpeg + scanAndRest;
+}
+
+QByteArray readFile(const QString &path)
+{
+    QFile file(path);
+    return file.open(QIODevice::ReadOnly) ? file.readAll() : QByteArray();
+}
+
+bool writeFile(const QString &path, const QByteArray &data)
+{
+    QFile file(path);
+    return file.open(QIODevice::WriteOnly) && file.write(data) == data.size();
+}
+
+} // namespace ExifTestSupport
