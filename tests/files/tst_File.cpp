@@ -1,4 +1,5 @@
 #include "File.h"
+#include "FileTestSupport.h"
 
 #include <QFile>
 #include <QJSEngine>
@@ -6,13 +7,9 @@
 #include <QTemporaryDir>
 #include <QtTest>
 
-namespace {
+using namespace FileTestSupport;
 
-QByteArray contents(const QString &path)
-{
-    QFile file(path);
-    return file.open(QIODevice::ReadOnly) ? file.readAll() : QByteArray("<unreadable>");
-}
+namespace {
 
 QByteArray utf16Bytes(const QString &text)
 {
@@ -29,19 +26,12 @@ private slots:
     void initTestCase();
     void lines_data();
     void lines();
-    void lastLineWithoutEnding_data();
-    void lastLineWithoutEnding();
-    void openAndClose();
+    void openAndTextMode();
     void openFailure();
-    void pathWhileOpen();
-    void closedFile();
-    void positionAndRead();
+    void pathForms();
+    void positionAppendAndTruncate();
     void writeValues_data();
     void writeValues();
-    void append();
-    void textMode();
-    void urlForm();
-    void destructorCloses();
     void writeErrorOnFullDevice();
 
 private:
@@ -57,86 +47,51 @@ void tst_File::initTestCase()
 void tst_File::lines_data()
 {
     QTest::addColumn<int>("encoding");
-    QTest::addColumn<QStringList>("lines");
     QTest::addColumn<QByteArray>("bytes");
+    QTest::addColumn<QStringList>("lines");
 
-    QTest::newRow("utf8 one char") << int(File::TextEncodingUtf8) << QStringList { "a" } << QByteArray("a\n");
-    QTest::newRow("utf8 non-latin") << int(File::TextEncodingUtf8) << QStringList { QString::fromUtf8("é✓"), "" }
-                                    << QByteArray("\xc3\xa9\xe2\x9c\x93\n\n");
-    QTest::newRow("latin1") << int(File::TextEncodingLatin1) << QStringList { QString::fromUtf8("é"), "b" }
-                            << QByteArray("\xe9\nb\n");
-    QTest::newRow("local 8-bit") << int(File::TextEncodingLocal8Bit) << QStringList { "plain" }
-                                 << QByteArray("plain\n");
-    const QString longLine = QString(70000, QChar(0x0A0A)) + QString::fromUtf8("é");
-    QTest::newRow("utf8 long line") << int(File::TextEncodingUtf8) << QStringList { longLine, "b", longLine }
-                                    << (longLine + "\nb\n" + longLine + "\n").toUtf8();
-    QTest::newRow("utf16 long line") << int(File::TextEncodingUtf16) << QStringList { longLine, longLine }
-                                     << utf16Bytes(longLine + "\n" + longLine + "\n");
-    QTest::newRow("utf16") << int(File::TextEncodingUtf16) << QStringList { "ab", "c" }
-                           << utf16Bytes(QStringLiteral("ab\nc\n"));
+    const int utf8 = File::TextEncodingUtf8;
+    const int utf16 = File::TextEncodingUtf16;
+    QTest::newRow("utf8 non-latin") << utf8 << QByteArray("\xc3\xa9\xe2\x9c\x93\n\n")
+                                    << QStringList { QString::fromUtf8("é✓\n"), "\n" };
+    QTest::newRow("latin1") << int(File::TextEncodingLatin1) << QByteArray("\xe9\nb\n")
+                            << QStringList { QString::fromUtf8("é\n"), "b\n" };
+    const QString longLine = QString(70000, QChar(0x0A0A)) + QString::fromUtf8("é\n");
+    QTest::newRow("utf8 long line") << utf8 << (longLine + "b\n" + longLine).toUtf8() << QStringList { longLine, "b\n", longLine };
+    QTest::newRow("utf16 long line") << utf16 << utf16Bytes(longLine + longLine) << QStringList { longLine, longLine };
     // U+0A0A and U+0D0A hold the line feed byte inside one character.
     const QString tricky = QString(QChar(0x0A0A)) + QChar(0x0D0A) + QChar(0x0A00) + QLatin1Char('x');
-    QTest::newRow("utf16 line feed bytes inside characters") << int(File::TextEncodingUtf16)
-                                                             << QStringList { tricky, tricky + tricky }
-                                                             << utf16Bytes(tricky + "\n" + tricky + tricky + "\n");
+    QTest::newRow("utf16 line feed bytes inside characters") << utf16 << utf16Bytes(tricky + "\n" + tricky + tricky + "\n")
+                                                             << QStringList { tricky + "\n", tricky + tricky + "\n" };
+    QTest::newRow("utf8 last line without ending") << utf8 << QByteArray("a\nlast") << QStringList { "a\n", "last" };
+    QTest::newRow("utf16 last line without ending") << utf16 << utf16Bytes("a\nlast") << QStringList { "a\n", "last" };
+    // Lines decode as C strings: a NUL ends the text of its line, while the
+    // position still moves past the whole line.
+    QTest::newRow("latin1 with NUL") << int(File::TextEncodingLatin1) << QByteArray("a\0b\nc", 5) << QStringList { "a", "c" };
+    // An odd byte at the end of UTF-16 text is half a character: dropped.
+    QTest::newRow("utf16 odd tail") << utf16 << utf16Bytes("ab") + "\n" << QStringList { "ab" };
 }
 
 void tst_File::lines()
 {
     QFETCH(int, encoding);
-    QFETCH(QStringList, lines);
     QFETCH(QByteArray, bytes);
+    QFETCH(QStringList, lines);
 
     const QString name = path(QStringLiteral("lines-%1.txt").arg(QTest::currentDataTag()));
-    {
+    const bool whole = std::all_of(lines.cbegin(), lines.cend(), [](const QString &l) { return l.endsWith('\n'); });
+    if (whole) {
         File file(name);
         file.setTextEncoding(File::TextEncoding(encoding));
         QVERIFY(file.open(File::OpenModeWriteOnly | File::OpenModeTruncate));
         for (const QString &line : qAsConst(lines))
-            file.writeLine(line);
+            file.writeLine(line.chopped(1));
         file.close();
+        QCOMPARE(contents(name), bytes);
+    } else {
+        QVERIFY(writeBytes(name, bytes));
     }
-    QCOMPARE(contents(name), bytes);
 
-    File file(name);
-    file.setTextEncoding(File::TextEncoding(encoding));
-    QVERIFY(file.open(File::OpenModeReadOnly));
-    for (const QString &line : qAsConst(lines))
-        QCOMPARE(file.readLine(), line + QLatin1Char('\n'));
-    QVERIFY(file.atEnd());
-    QVERIFY(file.readLine().isEmpty());
-}
-
-void tst_File::lastLineWithoutEnding_data()
-{
-    QTest::addColumn<int>("encoding");
-    QTest::addColumn<QByteArray>("bytes");
-    QTest::addColumn<QStringList>("lines");
-
-    QTest::newRow("utf8") << int(File::TextEncodingUtf8) << QByteArray("a\nlast") << QStringList { "a\n", "last" };
-    QTest::newRow("utf16") << int(File::TextEncodingUtf16) << utf16Bytes(QStringLiteral("a\nlast"))
-                           << QStringList { "a\n", "last" };
-    // Lines decode as C strings: a NUL ends the text of its line, while the
-    // position still moves past the whole line.
-    QTest::newRow("latin1 with NUL") << int(File::TextEncodingLatin1) << QByteArray("a\0b\nc", 5)
-                                     << QStringList { "a", "c" };
-    // An odd byte at the end of UTF-16 text is half a character: dropped.
-    QTest::newRow("utf16 odd tail") << int(File::TextEncodingUtf16) << utf16Bytes(QStringLiteral("ab")) + "\n"
-                                    << QStringList { "ab" };
-}
-
-void tst_File::lastLineWithoutEnding()
-{
-    QFETCH(int, encoding);
-    QFETCH(QByteArray, bytes);
-    QFETCH(QStringList, lines);
-
-    const QString name = path(QStringLiteral("tail-%1.txt").arg(QTest::currentDataTag()));
-    {
-        QFile raw(name);
-        QVERIFY(raw.open(QIODevice::WriteOnly));
-        raw.write(bytes);
-    }
     File file(name);
     file.setTextEncoding(File::TextEncoding(encoding));
     QVERIFY(file.open(File::OpenModeReadOnly));
@@ -145,126 +100,111 @@ void tst_File::lastLineWithoutEnding()
         read << file.readLine();
     QCOMPARE(read, lines);
     QCOMPARE(file.position(), qlonglong(bytes.size()));
+    QVERIFY(file.readLine().isEmpty());
 }
 
-void tst_File::openAndClose()
+void tst_File::openAndTextMode()
 {
-    const QString name = path(QStringLiteral("open.txt"));
-    QVERIFY(QFile(name).open(QIODevice::WriteOnly));
+    const QString name = path("textmode.txt");
+    QVERIFY(writeBytes(name, "a\r\nb\r\n"));
 
     File file(name);
-    QCOMPARE(file.openMode(), int(File::NotOpen));
-    QVERIFY(file.exists());
+    expectWarning("setTextMode.*File not open");
+    file.setTextMode(true);
+    QVERIFY(!file.textMode());
 
-    QStringList order;
-    connect(&file, &File::pathChanged, this, [&] { order << "path"; });
-    connect(&file, &File::openModeChanged, this, [&] { order << "openMode"; });
-    connect(&file, &File::positionChanged, this, [&] { order << "position"; });
-
+    // Opened without a mode it reads text; the mode is changed only once.
+    QSignalSpy modeSpy(&file, &File::openModeChanged);
     QVERIFY(file.open());
-    QCOMPARE(order.value(0), QStringLiteral("path"));
-    QCOMPARE(order.count(QStringLiteral("openMode")), 1);
-    QCOMPARE(order.count(QStringLiteral("position")), 1);
     QCOMPARE(file.openMode(), int(File::OpenModeReadOnly | File::OpenModeText));
-    QVERIFY(file.isReadable());
-    QVERIFY(!file.isWritable());
-    QVERIFY(file.textMode());
-
-    order.clear();
+    file.setTextMode(true);
+    QCOMPARE(file.readLine(), QStringLiteral("a\n"));
+    file.setTextMode(false);
+    QCOMPARE(file.readLine(), QStringLiteral("b\r\n"));
     file.close();
-    order.sort();
-    QCOMPARE(order, (QStringList { "openMode", "position" }));
+    file.close();
     QCOMPARE(file.openMode(), int(File::NotOpen));
+    QCOMPARE(modeSpy.count(), 3);
 
-    order.clear();
-    file.close();
-    QVERIFY(order.isEmpty());
+    // A file closed by its end keeps what was written.
+    {
+        File written(name);
+        QVERIFY(written.open(File::OpenModeWriteOnly));
+        written.write(QJSValue("kept"));
+    }
+    QCOMPARE(contents(name), QByteArray("kept"));
 }
 
 void tst_File::openFailure()
 {
-    File file(path(QStringLiteral("missing/none.txt")));
+    File file(path("missing/none.txt"));
     QSignalSpy errorSpy(&file, &File::errorChanged);
     QSignalSpy modeSpy(&file, &File::openModeChanged);
-    QTest::ignoreMessage(QtWarningMsg, QRegularExpression(QStringLiteral("none\\.txt")));
+    expectWarning("none\\.txt");
     QVERIFY(!file.open(File::OpenModeReadOnly));
     QCOMPARE(errorSpy.count(), 1);
     QCOMPARE(modeSpy.count(), 0);
     QCOMPARE(file.error(), int(File::ErrorOpen));
-    QVERIFY(!file.errorString().isEmpty());
-    QVERIFY(!file.exists());
 
     // Writing into a folder that is not there fails the same way.
-    QTest::ignoreMessage(QtWarningMsg, QRegularExpression(QStringLiteral("none\\.txt")));
+    expectWarning("none\\.txt");
     QVERIFY(!file.open(File::OpenModeWriteOnly));
-    QVERIFY(!QFileInfo::exists(path(QStringLiteral("missing"))));
+    QVERIFY(!QFileInfo::exists(path("missing")));
+
+    // Nothing reads or writes while closed.
+    expectWarning("readLine.*File not open");
+    QVERIFY(file.readLine().isNull());
+    expectWarning("File not open");
+    QVERIFY(file.readAll().toByteArray().isEmpty());
+    File closed(path("closed.txt"));
+    expectWarning("File not open");
+    closed.writeLine("lost");
+    QVERIFY(!QFileInfo::exists(closed.path()));
 }
 
-void tst_File::pathWhileOpen()
+void tst_File::pathForms()
 {
-    const QString first = path(QStringLiteral("first.txt"));
+    const QString first = path("first.txt");
     File file(first);
     QVERIFY(file.open(File::OpenModeWriteOnly));
-
     QSignalSpy spy(&file, &File::pathChanged);
-    QTest::ignoreMessage(QtWarningMsg, QRegularExpression(QStringLiteral("File is open:.*first\\.txt")));
-    file.setPath(path(QStringLiteral("second.txt")));
+    expectWarning("File is open:.*first\\.txt");
+    file.setPath(path("second.txt"));
     QCOMPARE(file.path(), first);
-    QCOMPARE(spy.count(), 0);
 
     file.close();
-    file.setPath(path(QStringLiteral("second.txt")));
-    QCOMPARE(file.path(), path(QStringLiteral("second.txt")));
+    file.setUrl(QUrl::fromLocalFile(path("second.txt")));
+    file.setPath(path("second.txt"));
     QCOMPARE(spy.count(), 1);
-    file.setPath(path(QStringLiteral("second.txt")));
-    QCOMPARE(spy.count(), 1);
+    file.setUrl(QUrl("qrc:/x/y.txt"));
+    QCOMPARE(file.path(), QStringLiteral(":/x/y.txt"));
+    QCOMPARE(file.url(), QUrl("qrc:///x/y.txt"));
 }
 
-void tst_File::closedFile()
+void tst_File::positionAppendAndTruncate()
 {
-    File file(path(QStringLiteral("closed.txt")));
-    QTest::ignoreMessage(QtWarningMsg, QRegularExpression(QStringLiteral("readLine.*File not open")));
-    const QString line = file.readLine();
-    QVERIFY(line.isNull());
-
-    QTest::ignoreMessage(QtWarningMsg, QRegularExpression(QStringLiteral("File not open")));
-    file.writeLine(QStringLiteral("lost"));
-    QVERIFY(!QFileInfo::exists(file.path()));
-
-    QTest::ignoreMessage(QtWarningMsg, QRegularExpression(QStringLiteral("File not open")));
-    QVERIFY(file.readAll().toByteArray().isEmpty());
-}
-
-void tst_File::positionAndRead()
-{
-    const QString name = path(QStringLiteral("position.bin"));
-    {
-        QFile raw(name);
-        QVERIFY(raw.open(QIODevice::WriteOnly));
-        raw.write("0123456789");
+    const QString name = path("position.txt");
+    for (const char *part : { "0123", "4567", "89" }) {
+        File file(name);
+        QVERIFY(file.open(File::OpenModeWriteOnly | File::OpenModeAppend));
+        file.write(QJSValue(part));
     }
 
     File file(name);
-    QVERIFY(file.open(File::OpenModeReadOnly));
+    QVERIFY(file.open(File::OpenModeReadWrite));
     QSignalSpy spy(&file, &File::positionChanged);
-
     QCOMPARE(file.read(3).toByteArray(), QByteArray("012"));
-    QCOMPARE(file.position(), qlonglong(3));
-    QCOMPARE(spy.count(), 1);
-
     QVERIFY(file.setProperty("position", 8));
-    QCOMPARE(spy.count(), 2);
     QCOMPARE(file.read(100).toByteArray(), QByteArray("89"));
     QVERIFY(file.atEnd());
-
-    file.setPosition(file.position());
     QCOMPARE(spy.count(), 3);
-
     QVERIFY(file.read(-1).toByteArray().isEmpty());
     QVERIFY(file.reset());
-    QCOMPARE(file.position(), qlonglong(0));
     QCOMPARE(file.readAll().toByteArray(), QByteArray("0123456789"));
-    QCOMPARE(file.read(5).toByteArray(), QByteArray());
+    file.close();
+
+    QVERIFY(file.open(File::OpenModeReadWrite | File::OpenModeTruncate));
+    QCOMPARE(file.readAll().toByteArray(), QByteArray());
 }
 
 void tst_File::writeValues_data()
@@ -290,106 +230,30 @@ void tst_File::writeValues()
     QFETCH(QByteArray, expected);
 
     QJSEngine engine;
-    const QJSValue value = binary ? engine.toScriptValue(expected)
-                                  : QJSValue(QString::fromUtf8("ä1"));
-    if (binary)
-        QVERIFY(!value.isString());
+    const QJSValue value = binary ? engine.toScriptValue(expected) : QJSValue(QString::fromUtf8("ä1"));
+    QCOMPARE(value.isString(), !binary);
 
     const QString name = path(QStringLiteral("value-%1.bin").arg(QTest::currentDataTag()));
     File file(name);
     file.setTextEncoding(File::TextEncoding(encoding));
     QVERIFY(file.open(File::OpenModeWriteOnly));
-    QSignalSpy spy(&file, &File::positionChanged);
     if (encoding == File::TextEncodingUnknown)
-        QTest::ignoreMessage(QtWarningMsg, QRegularExpression(QStringLiteral("Undefined encoding")));
+        expectWarning("Undefined encoding");
     file.write(value);
-    QCOMPARE(spy.count(), 1);
     QCOMPARE(file.position(), qlonglong(expected.size()));
     file.close();
     QCOMPARE(contents(name), expected);
 }
 
-void tst_File::append()
-{
-    const QString name = path(QStringLiteral("append.txt"));
-    for (int i = 0; i < 3; ++i) {
-        File file(name);
-        QVERIFY(file.open(File::OpenModeWriteOnly | File::OpenModeAppend));
-        file.writeLine(QString::number(i));
-    }
-    QCOMPARE(contents(name), QByteArray("0\n1\n2\n"));
-
-    File file(name);
-    QVERIFY(file.open(File::OpenModeReadWrite | File::OpenModeTruncate));
-    QCOMPARE(file.readAll().toByteArray(), QByteArray());
-}
-
-void tst_File::textMode()
-{
-    const QString name = path(QStringLiteral("textmode.txt"));
-    {
-        QFile raw(name);
-        QVERIFY(raw.open(QIODevice::WriteOnly));
-        raw.write("a\r\nb\r\n");
-    }
-
-    File file(name);
-    QTest::ignoreMessage(QtWarningMsg, QRegularExpression(QStringLiteral("setTextMode.*File not open")));
-    file.setTextMode(true);
-    QVERIFY(!file.textMode());
-
-    QVERIFY(file.open(File::OpenModeReadOnly));
-    QSignalSpy spy(&file, &File::openModeChanged);
-    file.setTextMode(true);
-    QCOMPARE(spy.count(), 1);
-    QVERIFY(file.openMode() & File::OpenModeText);
-    QCOMPARE(file.readLine(), QStringLiteral("a\n"));
-    file.setTextMode(true);
-    QCOMPARE(spy.count(), 1);
-    file.setTextMode(false);
-    QCOMPARE(file.readLine(), QStringLiteral("b\r\n"));
-}
-
-void tst_File::urlForm()
-{
-    const QString name = path(QStringLiteral("url form.txt"));
-    File file(QUrl::fromLocalFile(name));
-    QCOMPARE(file.path(), name);
-    QCOMPARE(file.url(), QUrl::fromLocalFile(name));
-
-    QSignalSpy spy(&file, &File::pathChanged);
-    file.setUrl(QUrl::fromLocalFile(name));
-    QCOMPARE(spy.count(), 0);
-    file.setUrl(QUrl(QStringLiteral("qrc:/x/y.txt")));
-    QCOMPARE(spy.count(), 1);
-    QCOMPARE(file.path(), QStringLiteral(":/x/y.txt"));
-    QCOMPARE(file.url(), QUrl(QStringLiteral("qrc:///x/y.txt")));
-}
-
-void tst_File::destructorCloses()
-{
-    const QString name = path(QStringLiteral("destructor.txt"));
-    int modeChanges = 0;
-    {
-        File file(name);
-        QVERIFY(file.open(File::OpenModeWriteOnly));
-        file.write(QJSValue(QStringLiteral("kept")));
-        connect(&file, &File::openModeChanged, this, [&] { ++modeChanges; });
-    }
-    QCOMPARE(modeChanges, 1);
-    QCOMPARE(contents(name), QByteArray("kept"));
-}
-
 void tst_File::writeErrorOnFullDevice()
 {
-    if (!QFileInfo::exists(QStringLiteral("/dev/full")))
+    if (!QFileInfo::exists("/dev/full"))
         QSKIP("No /dev/full here");
     File file(QStringLiteral("/dev/full"));
     QVERIFY(file.open(File::OpenModeWriteOnly));
     QSignalSpy spy(&file, &File::errorChanged);
-    file.write(QJSValue(QStringLiteral("nowhere to go")));
-    const bool flushed = file.flush();
-    QVERIFY(!flushed);
+    file.write(QJSValue("nowhere to go"));
+    QVERIFY(!file.flush());
     QVERIFY(spy.count() >= 1);
     // No space left is a resource error.
     QCOMPARE(file.error(), int(File::ErrorResource));

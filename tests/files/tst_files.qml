@@ -49,29 +49,18 @@ TestCase {
     }
 
     function test_singletonMembers() {
-        compare(Loomkit.userHomeFolder.path, Loomkit.userHomePath)
+        // Folders are fresh objects; the services are one each.
         verify(Loomkit.userHomeFolder !== Loomkit.userHomeFolder)
+        compare(Loomkit.userHomeFolder.path, Loomkit.userHomePath)
         verify(Loomkit.temporaryFolder.exists)
-        compare(Loomkit.typeOf(Loomkit.temporaryFolder), "FileFolder")
-
         verify(Loomkit.standardPaths === Loomkit.standardPaths)
         compare(Loomkit.standardPaths.writableLocation(StandardPaths.HomeLocation), Loomkit.userHomePath)
-        compare(Loomkit.standardPaths.writableLocation("HomeLocation"), Loomkit.userHomePath)
+        verify(Loomkit.environment === Loomkit.environment)
+        verify(Loomkit.environment.setValue("LOOMKIT_QML_TEST", "on"))
+        verify(Loomkit.environment.names.indexOf("LOOMKIT_QML_TEST") >= 0)
+        verify(Loomkit.environment.remove("LOOMKIT_QML_TEST"))
 
-        var environment = Loomkit.environment
-        verify(environment === Loomkit.environment)
-        verify(environment.setValue("LOOMKIT_QML_TEST", "on"))
-        verify(environment.contains("LOOMKIT_QML_TEST"))
-        compare(environment.value("LOOMKIT_QML_TEST"), "on")
-        verify(environment.names.indexOf("LOOMKIT_QML_TEST") >= 0)
-        verify(environment.remove("LOOMKIT_QML_TEST"))
-        compare(environment.value("LOOMKIT_QML_TEST", "gone"), "gone")
-    }
-
-    function test_factories() {
         compare(Loomkit.file("~/a.txt").path, Loomkit.userHomePath + "/a.txt")
-        compare(Loomkit.fileInfo("~/b.txt").fileName, "b.txt")
-        compare(Loomkit.fileFolder("~").path, Loomkit.userHomePath)
         var url = work.fileUrl("c.txt")
         compare(Loomkit.file(url).path, work.filePath("c.txt"))
         compare(Loomkit.fileInfo(url).filePath, work.filePath("c.txt"))
@@ -109,15 +98,8 @@ TestCase {
         verify(work.writeJsonFile("j.json", { name: "x", list: [1, 2] }))
         compare(work.readJsonFile("j.json").list, [1, 2])
         verify(!work.writeTextFile("missing/t.txt", "t"))
-    }
 
-    function test_csvAndXml() {
-        verify(work.writeTextFile("t.csv", "a,b\n1,two\n"))
-        var rows = work.readCsvFile("t.csv")
-        compare(rows.length, 1)
-        compare(rows[0].a, 1)
-        compare(rows[0].b, "two")
-
+        // A CSV error is raised in the script.
         var message = ""
         try {
             work.readCsvFile("none.csv")
@@ -125,34 +107,20 @@ TestCase {
             message = error.message
         }
         compare(message, "Error reading CSV file:Open QIODevice failed.")
-
-        verify(work.writeTextFile("t.xml", "<r><a>1</a></r>"))
-        compare(work.readXmlFile("t.xml").a, "1")
     }
 
     function test_fileStream() {
+        // The enumerations reach QML, and a file info keeps one folder.
         var file = createTemporaryObject(fileComponent, this, { path: work.filePath("stream.txt") })
-        var positionSpy = createTemporaryObject(spyComponent, this, { target: file, signalName: "positionChanged" })
         file.textEncoding = File.TextEncodingUtf16
         verify(file.open(File.OpenModeWriteOnly))
         file.writeLine("a")
-        verify(positionSpy.count >= 2)
-        compare(file.position, 4)
         file.close()
-        compare(new Uint8Array(work.readFile("stream.txt")).length, 4)
-
-        verify(file.open(File.OpenModeReadOnly))
-        compare(file.readLine(), "a\n")
-        verify(file.atEnd)
-        file.close()
-
         var info = work.fileInfo("stream.txt")
         compare(info.size, 4)
-        compare(info.folder.path, work.path)
         verify(info.folder === info.folder)
         verify(info.setPermissions(FileInfo.ReadOwner | FileInfo.WriteOwner))
         compare(info.permissions & 0x7077, FileInfo.ReadOwner | FileInfo.WriteOwner)
-        verify(info.getExtendedProperty("x") === undefined)
     }
 
     function test_trashAsync() {
@@ -168,7 +136,6 @@ TestCase {
         work.moveFileToTrashAsync("trash-me.txt")
         compare(received.length, 0)
         spy.wait(5000)
-        compare(received.length, 1)
         compare(received[0].originalFile, "trash-me.txt")
         verify(received[0].pathInTrash.indexOf("/Trash/files/") > 0, received[0].pathInTrash)
         compare(received[0].error, "")
@@ -179,8 +146,7 @@ TestCase {
         spy.wait(5000)
         compare(received[1].error, "File does not exist.")
         verify(received[1].pathInTrash === undefined)
-        compare(spy.count, 2)
-        compare(spy.signalArguments[1][2], "File does not exist.")
+        // A Connections handler gets all three arguments too.
         compare(connections.calls.length, 2)
         compare(connections.calls[0][1], received[0].pathInTrash)
         compare(connections.calls[1][2], "File does not exist.")
@@ -190,12 +156,8 @@ TestCase {
     function test_storage() {
         var storage = createTemporaryObject(storageComponent, this, { path: "~" })
         verify(storage.isValid)
-        verify(storage.bytesTotal > 0)
-        verify(storage.bytesAvailable <= storage.bytesTotal)
-        verify(storage.rootPath.length > 0)
-        verify(storage.storageType >= StorageInfo.StorageTypeUnknown && storage.storageType <= StorageInfo.StorageTypeRam)
+        verify(storage.bytesTotal > 0 && storage.bytesAvailable <= storage.bytesTotal)
         verify(storage.mountedVolumes.length > 0)
-
         storage.path = "/no/such/place"
         verify(!storage.isValid)
         compare(storage.storageType, StorageInfo.StorageTypeNoRoot)

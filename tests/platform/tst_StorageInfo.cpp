@@ -1,3 +1,4 @@
+#include "../files/FileTestSupport.h"
 #include "StorageInfo.h"
 #include "TestSupport.h"
 
@@ -23,13 +24,6 @@ QStringList findmnt(const QString &path)
     return QString::fromLocal8Bit(out).simplified().split(QLatin1Char(' '));
 }
 
-bool writeText(const QString &path, const QByteArray &text)
-{
-    QDir().mkpath(QFileInfo(path).absolutePath());
-    QFile file(path);
-    return file.open(QIODevice::WriteOnly) && file.write(text) == text.size();
-}
-
 } // namespace
 
 class tst_StorageInfo : public QObject
@@ -39,7 +33,6 @@ class tst_StorageInfo : public QObject
 private slots:
     void homeVolume();
     void invalidPath();
-    void pathChanges();
     void mountedVolumes();
     void classification_data();
     void classification();
@@ -49,7 +42,7 @@ private slots:
 
 void tst_StorageInfo::homeVolume()
 {
-    if (!TestSupport::hasProgram(QStringLiteral("findmnt")) || !TestSupport::hasProgram(QStringLiteral("stat")))
+    if (!TestSupport::hasProgram("findmnt") || !TestSupport::hasProgram("stat"))
         QSKIP("findmnt or stat is missing");
 
     const QString home = QDir::homePath();
@@ -63,27 +56,34 @@ void tst_StorageInfo::homeVolume()
     QCOMPARE(info.rootPath(), mount.at(0));
     QCOMPARE(info.fileSystemType(), mount.at(1));
     QCOMPARE(info.isRoot(), mount.at(0) == QLatin1String("/"));
-    QVERIFY(!info.displayName().isEmpty());
 
     int exitCode = -1;
-    const QStringList blocks = QString::fromLatin1(TestSupport::run(QStringLiteral("stat"),
-        { QStringLiteral("-f"), QStringLiteral("-c"), QStringLiteral("%S %b %f %a"), home }, &exitCode)).simplified().split(' ');
+    const QStringList blocks = QString::fromLatin1(TestSupport::run("stat", { "-f", "-c", "%S %b %f %a", home }, &exitCode))
+                                   .simplified().split(' ');
     QCOMPARE(exitCode, 0);
     QCOMPARE(blocks.size(), 4);
     const qint64 unit = blocks.at(0).toLongLong();
+    QSignalSpy storageSpy(&info, &StorageInfo::storageChanged);
     info.refresh();
+    QCOMPARE(storageSpy.count(), 1);
     QCOMPARE(info.bytesTotal(), unit * blocks.at(1).toLongLong());
     // Other processes write meanwhile; the free counts may drift a little.
     const qint64 slack = 256 * 1024 * 1024;
     QVERIFY(qAbs(info.bytesFree() - unit * blocks.at(2).toLongLong()) < slack);
     QVERIFY(qAbs(info.bytesAvailable() - unit * blocks.at(3).toLongLong()) < slack);
-    QVERIFY(info.bytesAvailable() <= info.bytesFree());
-    QVERIFY(info.blockSize() > 0);
 
     const QVariantMap map = info.toVariantMap();
     QCOMPARE(map.value("rootPath").toString(), info.rootPath());
     QCOMPARE(map.value("bytesTotal").toLongLong(), info.bytesTotal());
     QCOMPARE(map.value("storageType").toInt(), int(info.storageType()));
+
+    // A new path tells both the path and the storage bindings.
+    QSignalSpy pathSpy(&info, &StorageInfo::pathChanged);
+    info.setUrl(QUrl::fromLocalFile("/"));
+    info.setPath("/");
+    QCOMPARE(pathSpy.count(), 1);
+    QCOMPARE(storageSpy.count(), 2);
+    QVERIFY(info.isRoot());
 }
 
 void tst_StorageInfo::invalidPath()
@@ -93,53 +93,18 @@ void tst_StorageInfo::invalidPath()
     QVERIFY(!info.isReady());
     QCOMPARE(info.storageType(), StorageInfo::StorageTypeNoRoot);
     QCOMPARE(info.bytesTotal(), qlonglong(0));
-    QCOMPARE(info.bytesAvailable(), qlonglong(0));
-    QVERIFY(info.displayName().isEmpty());
     QVERIFY(info.rootPath().isEmpty());
-
-    StorageInfo none;
-    QVERIFY(!none.isValid());
-    QVERIFY(none.url().isEmpty());
-    QCOMPARE(none.toVariantMap().value("isValid").toBool(), false);
-}
-
-void tst_StorageInfo::pathChanges()
-{
-    QTemporaryDir dir;
-    QVERIFY(dir.isValid());
-
-    StorageInfo info;
-    QSignalSpy pathSpy(&info, &StorageInfo::pathChanged);
-    QSignalSpy storageSpy(&info, &StorageInfo::storageChanged);
-    info.setPath(dir.path());
-    QCOMPARE(pathSpy.count(), 1);
-    QCOMPARE(storageSpy.count(), 1);
-    QVERIFY(info.isValid());
-    info.setPath(dir.path());
-    QCOMPARE(pathSpy.count(), 1);
-
-    info.setUrl(QUrl::fromLocalFile(QStringLiteral("/")));
-    QCOMPARE(info.path(), QStringLiteral("/"));
-    QCOMPARE(info.url(), QUrl::fromLocalFile(QStringLiteral("/")));
-    QVERIFY(info.isRoot());
-    QCOMPARE(pathSpy.count(), 2);
-
-    info.refresh();
-    QCOMPARE(storageSpy.count(), 3);
+    QCOMPARE(StorageInfo().toVariantMap().value("isValid").toBool(), false);
 }
 
 void tst_StorageInfo::mountedVolumes()
 {
-    StorageInfo info;
-    const QVariantList volumes = info.mountedVolumes();
-    QVERIFY(!volumes.isEmpty());
     QStringList roots;
-    for (const QVariant &volume : volumes) {
-        const QVariantMap map = volume.toMap();
-        QVERIFY(map.value("isValid").toBool());
-        roots << map.value("rootPath").toString();
+    for (const QVariant &volume : StorageInfo().mountedVolumes()) {
+        QVERIFY(volume.toMap().value("isValid").toBool());
+        roots << volume.toMap().value("rootPath").toString();
     }
-    QVERIFY2(roots.contains(QStringLiteral("/")), qPrintable(roots.join(' ')));
+    QVERIFY2(roots.contains("/"), qPrintable(roots.join(' ')));
     QVERIFY(roots.contains(StorageInfo(QDir::homePath()).rootPath()));
 }
 
@@ -184,8 +149,8 @@ void tst_StorageInfo::classification()
     for (const auto &disk : disks) {
         const QString folder = devices + QLatin1Char('/') + disk.first;
         const QString name = QFileInfo(folder).fileName();
-        QVERIFY(writeText(folder + QStringLiteral("/removable"), disk.second));
-        QVERIFY(writeText(folder + QLatin1Char('/') + name + QStringLiteral("1/partition"), "1\n"));
+        QVERIFY(FileTestSupport::writeBytes(folder + QStringLiteral("/removable"), disk.second));
+        QVERIFY(FileTestSupport::writeBytes(folder + QLatin1Char('/') + name + QStringLiteral("1/partition"), "1\n"));
         QVERIFY(QFile::link(folder, classBlock + QLatin1Char('/') + name));
         QVERIFY(QFile::link(folder + QLatin1Char('/') + name + QLatin1Char('1'), classBlock + QLatin1Char('/') + name + QLatin1Char('1')));
     }
@@ -219,10 +184,7 @@ void tst_StorageInfo::registeredEnumeration()
 
     const int id = QMetaType::type(name.constData());
     QVERIFY(id != QMetaType::UnknownType);
-    QCOMPARE(QMetaType::sizeOf(id), 4);
-    const QMetaType::TypeFlags flags = QMetaType::typeFlags(id);
-    QVERIFY(flags.testFlag(QMetaType::IsEnumeration));
-    QVERIFY(flags.testFlag(QMetaType::MovableType));
+    QVERIFY(QMetaType::typeFlags(id).testFlag(QMetaType::IsEnumeration));
 }
 
 QTEST_GUILESS_MAIN(tst_StorageInfo)
