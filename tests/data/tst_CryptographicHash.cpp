@@ -1,17 +1,15 @@
 #include "BinaryData.h"
 #include "CryptographicHash.h"
-#include "TestSupport.h"
+#include "DigestOracle.h"
 
 #include <QJSEngine>
 #include <QQmlEngine>
-#include <QRandomGenerator>
 #include <QSignalSpy>
 #include <QTemporaryDir>
 #include <QtTest>
 
-// Python with the Debian crypto module is the oracle: it covers Keccak and
-// MD4, which the openssl command line no longer offers.
-static const QString kPython = QStringLiteral("/usr/bin/python3");
+static const QString kAbc = QStringLiteral("ba7816bf8f01cfea414140de5dae2223b00361a396177a9cb410ff61f20015ad");
+static const QString kEmpty = QStringLiteral("e3b0c44298fc1c149afbf4c8996fb92427ae41e4649b934ca495991b7852b855");
 
 class tst_CryptographicHash : public QObject
 {
@@ -22,10 +20,8 @@ private slots:
     void knownVectors();
     void againstOracle_data();
     void againstOracle();
-    void incremental();
+    void streamState();
     void inputKinds();
-    void algorithmChangeRestarts();
-    void missingFile();
 };
 
 void tst_CryptographicHash::knownVectors_data()
@@ -38,18 +34,12 @@ void tst_CryptographicHash::knownVectors_data()
     // RFC 1320, RFC 1321 and FIPS 180/202 sample values; Keccak as its authors published.
     QTest::newRow("md4 abc") << int(H::Md4) << QByteArray("abc") << "a448017aaf21d8525fc10ae87aa6729d";
     QTest::newRow("md5 empty") << int(H::Md5) << QByteArray() << "d41d8cd98f00b204e9800998ecf8427e";
-    QTest::newRow("md5 abc") << int(H::Md5) << QByteArray("abc") << "900150983cd24fb0d6963f7d28e17f72";
     QTest::newRow("sha1 abc") << int(H::Sha1) << QByteArray("abc") << "a9993e364706816aba3e25717850c26c9cd0d89d";
-    QTest::newRow("sha224 abc") << int(H::Sha224) << QByteArray("abc")
-                                << "23097d223405d8228642a477bda255b32aadbce4bda0b3f7e36c9da7";
     QTest::newRow("sha256 abc") << int(H::Sha256) << QByteArray("abc")
                                 << "ba7816bf8f01cfea414140de5dae2223b00361a396177a9cb410ff61f20015ad";
     QTest::newRow("sha256 two blocks") << int(H::Sha256)
                                        << QByteArray("abcdbcdecdefdefgefghfghighijhijkijkljklmklmnlmnomnopnopq")
                                        << "248d6a61d20638b8e5c026930c3e6039a33ce45964ff2167f6ecedd419db06c1";
-    QTest::newRow("sha384 abc") << int(H::Sha384) << QByteArray("abc")
-                                << "cb00753f45a35e8bb5a03d699ac65007272c32ab0eded1631a8b605a43ff5bed"
-                                   "8086072ba1e7cc2358baeca134c825a7";
     QTest::newRow("sha512 abc") << int(H::Sha512) << QByteArray("abc")
                                 << "ddaf35a193617abacc417349ae20413112e6fa4e89a97ea20a9eeee64b55d39a"
                                    "2192992a274fc1a836ba3c23a3feebbd454d4423643ce80e2a9ac94fa54ca49f";
@@ -106,29 +96,15 @@ void tst_CryptographicHash::againstOracle()
 {
     QFETCH(int, algorithm);
     QFETCH(QString, expression);
-    if (!QFile::exists(kPython))
-        QSKIP("python3 is not installed");
 
     // Odd sizes cross block boundaries and the 256 KiB read chunk.
     QTemporaryDir dir;
     const QString path = dir.filePath(QStringLiteral("data.bin"));
-    QByteArray bytes(300 * 1024 + 7, Qt::Uninitialized);
-    QRandomGenerator generator(algorithm + 11);
-    for (char &c : bytes)
-        c = char(generator.bounded(256));
-    QFile file(path);
-    QVERIFY(file.open(QIODevice::WriteOnly));
-    file.write(bytes);
-    file.close();
-
-    int exitCode = 0;
-    const QString script = QStringLiteral("import sys, hashlib\n"
-                                          "from Cryptodome.Hash import keccak, MD4\n"
-                                          "d = open(sys.argv[1], 'rb').read()\n"
-                                          "print(%1.hexdigest())\n").arg(expression);
-    const QByteArray expected = TestSupport::run(kPython, { QStringLiteral("-c"), script, path }, &exitCode).trimmed();
-    if (exitCode != 0)
-        QSKIP("python3-pycryptodome is not installed");
+    QVERIFY(DigestOracle::writeFile(path, DigestOracle::randomBytes(algorithm + 11, 300 * 1024 + 7)));
+    const QByteArray expected = DigestOracle::hexDigest(
+        QStringLiteral("d = open(sys.argv[1], 'rb').read()\nprint(%1.hexdigest())\n").arg(expression), { path });
+    if (expected.isEmpty())
+        QSKIP("python3 with python3-pycryptodome is not installed");
 
     CryptographicHash hash;
     hash.setAlgorithm(CryptographicHash::Algorithm(algorithm));
@@ -136,74 +112,60 @@ void tst_CryptographicHash::againstOracle()
     QCOMPARE(hash.hex().toLatin1(), expected);
 }
 
-void tst_CryptographicHash::incremental()
+void tst_CryptographicHash::streamState()
 {
     CryptographicHash hash;
-    QSignalSpy spy(&hash, &CryptographicHash::resultChanged);
+    QSignalSpy resultSpy(&hash, &CryptographicHash::resultChanged);
     hash.addBytes("ab");
     // Reading the result midway must not end the stream.
-    QCOMPARE(hash.hex(), QString::fromLatin1(QCryptographicHash::hash("ab", QCryptographicHash::Sha256).toHex()));
+    QCOMPARE(hash.hex(), QStringLiteral("fb8e20fc2e4c3f248c60c39bd652f3c1347298bb977b8b4d5903b85055620603"));
     hash.addBytes("c");
-    QCOMPARE(hash.hex(), QStringLiteral("ba7816bf8f01cfea414140de5dae2223b00361a396177a9cb410ff61f20015ad"));
-    QCOMPARE(spy.count(), 2);
-
+    QCOMPARE(hash.hex(), kAbc);
+    QCOMPARE(resultSpy.count(), 2);
     QScopedPointer<BinaryData> result(hash.result());
-    QCOMPARE(result->hex(), hash.hex());
+    QCOMPARE(result->hex(), kAbc);
 
+    QTest::ignoreMessage(QtWarningMsg, QRegularExpression("Cannot open"));
+    QVERIFY(!hash.addFile(QStringLiteral("/nonexistent/file")));
+    QCOMPARE(hash.hex(), kAbc);
     hash.reset();
-    QCOMPARE(hash.hex(), QStringLiteral("e3b0c44298fc1c149afbf4c8996fb92427ae41e4649b934ca495991b7852b855"));
+    QCOMPARE(hash.hex(), kEmpty);
+
+    // A new algorithm starts over; a bad one is refused.
+    hash.addBytes("abc");
+    QSignalSpy algorithmSpy(&hash, &CryptographicHash::algorithmChanged);
+    hash.setAlgorithm(CryptographicHash::Md5);
+    hash.setAlgorithm(CryptographicHash::Md5);
+    QCOMPARE(algorithmSpy.count(), 1);
+    QCOMPARE(hash.hex(), QStringLiteral("d41d8cd98f00b204e9800998ecf8427e"));
+    QTest::ignoreMessage(QtWarningMsg, QRegularExpression("Unsupported algorithm"));
+    hash.setAlgorithm(CryptographicHash::Algorithm(99));
+    QCOMPARE(hash.algorithm(), CryptographicHash::Md5);
 }
 
 void tst_CryptographicHash::inputKinds()
 {
     QJSEngine engine;
-    const QString abc = QStringLiteral("ba7816bf8f01cfea414140de5dae2223b00361a396177a9cb410ff61f20015ad");
-
     CryptographicHash fromBuffer;
     QVERIFY(fromBuffer.addData(engine.evaluate(QStringLiteral("new Uint8Array([97, 98, 99]).buffer"))));
-    QCOMPARE(fromBuffer.hex(), abc);
+    QCOMPARE(fromBuffer.hex(), kAbc);
 
     BinaryData bytes;
     bytes.setData(QByteArray("abc"));
     QQmlEngine::setObjectOwnership(&bytes, QQmlEngine::CppOwnership);
     CryptographicHash fromObject;
     QVERIFY(fromObject.addData(engine.newQObject(&bytes)));
-    QCOMPARE(fromObject.hex(), abc);
+    QCOMPARE(fromObject.hex(), kAbc);
 
     // Text is UTF-8.
     CryptographicHash fromText;
     QVERIFY(fromText.addData(QJSValue(QStringLiteral("\u00e9"))));
-    QCOMPARE(fromText.resultBytes(), QCryptographicHash::hash("\xc3\xa9", QCryptographicHash::Sha256));
+    QCOMPARE(fromText.hex(), QStringLiteral("4a99557e4033c3539de2eb65472017cad5f9557f7a0625a09f1c3f6e2ba69c4c"));
 
-    CryptographicHash bad;
     QTest::ignoreMessage(QtWarningMsg, QRegularExpression("Unsupported data type"));
-    QVERIFY(!bad.addData(QJSValue()));
+    QVERIFY(!fromText.addData(QJSValue()));
     QTest::ignoreMessage(QtWarningMsg, QRegularExpression("Unsupported data type"));
-    QVERIFY(bad.hash(engine.evaluate(QStringLiteral("({ a: 1 })"))).isEmpty());
-}
-
-void tst_CryptographicHash::algorithmChangeRestarts()
-{
-    CryptographicHash hash;
-    hash.addBytes("abc");
-    QSignalSpy spy(&hash, &CryptographicHash::algorithmChanged);
-    hash.setAlgorithm(CryptographicHash::Md5);
-    QCOMPARE(spy.count(), 1);
-    QCOMPARE(hash.hex(), QStringLiteral("d41d8cd98f00b204e9800998ecf8427e"));
-    hash.setAlgorithm(CryptographicHash::Md5);
-    QCOMPARE(spy.count(), 1);
-
-    QTest::ignoreMessage(QtWarningMsg, QRegularExpression("Unsupported algorithm"));
-    hash.setAlgorithm(CryptographicHash::Algorithm(99));
-    QCOMPARE(hash.algorithm(), CryptographicHash::Md5);
-}
-
-void tst_CryptographicHash::missingFile()
-{
-    CryptographicHash hash;
-    QTest::ignoreMessage(QtWarningMsg, QRegularExpression("Cannot open"));
-    QVERIFY(!hash.addFile(QStringLiteral("/nonexistent/file")));
-    QCOMPARE(hash.hex(), QStringLiteral("e3b0c44298fc1c149afbf4c8996fb92427ae41e4649b934ca495991b7852b855"));
+    QVERIFY(fromText.hash(engine.evaluate(QStringLiteral("({ a: 1 })"))).isEmpty());
 }
 
 QTEST_MAIN(tst_CryptographicHash)

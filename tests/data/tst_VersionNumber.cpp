@@ -14,8 +14,7 @@ private slots:
     void parse();
     void compare_data();
     void compare();
-    void segmentSetters();
-    void factories();
+    void editing();
 };
 
 void tst_VersionNumber::parse_data()
@@ -36,17 +35,14 @@ void tst_VersionNumber::parse_data()
 void tst_VersionNumber::parse()
 {
     QFETCH(QString, text);
-    QFETCH(QString, versionString);
-    QFETCH(QString, suffix);
     QFETCH(int, segmentCount);
-    QFETCH(int, minor);
 
     VersionNumber version;
     version.setVersionString(text);
-    QCOMPARE(version.versionString(), versionString);
-    QCOMPARE(version.suffix(), suffix);
+    QTEST(version.versionString(), "versionString");
+    QTEST(version.suffix(), "suffix");
     QCOMPARE(version.segmentCount(), segmentCount);
-    QCOMPARE(version.minorVersion(), minor);
+    QTEST(version.minorVersion(), "minor");
     QCOMPARE(version.isNull(), segmentCount == 0);
 }
 
@@ -81,51 +77,35 @@ void tst_VersionNumber::compare()
     Loomkit loomkit;
     QCOMPARE(::sign(loomkit.compareVersionNumber(left, right)), sign);
     QCOMPARE(::sign(loomkit.compareVersionNumber(right, left)), -sign);
-
-    VersionNumber version(VersionNumber::toVersion(left));
-    QCOMPARE(::sign(version.compare(right)), sign);
     // A VersionNumber object converts as well.
+    VersionNumber version(VersionNumber::toVersion(left));
     QCOMPARE(::sign(loomkit.compareVersionNumber(QVariant::fromValue<QObject *>(&version), right)), sign);
 }
 
-void tst_VersionNumber::segmentSetters()
+void tst_VersionNumber::editing()
 {
     VersionNumber version;
     QSignalSpy spy(&version, &VersionNumber::versionChanged);
     version.setMicroVersion(4);
-    QCOMPARE(version.versionString(), QStringLiteral("0.0.4"));
+    version.setMajorVersion(3);
     version.setMajorVersion(3);
     QCOMPARE(version.versionString(), QStringLiteral("3.0.4"));
     QCOMPARE(spy.count(), 2);
-    version.setMajorVersion(3);
-    QCOMPARE(spy.count(), 2);
-
     QTest::ignoreMessage(QtWarningMsg, QRegularExpression("Negative segment"));
     version.setMinorVersion(-1);
     QCOMPARE(version.versionString(), QStringLiteral("3.0.4"));
 
-    version.setSegments({ 1, 2 });
-    QCOMPARE(version.segments(), (QVariantList { 1, 2 }));
-    QVERIFY(version.isNormalized());
-    version.setVersionString(QStringLiteral("1.2.0"));
-    QVERIFY(!version.isNormalized());
-    QScopedPointer<VersionNumber> normalized(version.normalized());
+    Loomkit loomkit;
+    QScopedPointer<VersionNumber> made(loomkit.versionNumber(QStringLiteral("1.2.0-alpha")));
+    QCOMPARE(QQmlEngine::objectOwnership(made.data()), QQmlEngine::JavaScriptOwnership);
+    QVERIFY(!made->parent());
+    QVERIFY(!made->isNormalized());
+    QScopedPointer<VersionNumber> normalized(made->normalized());
     QCOMPARE(normalized->versionString(), QStringLiteral("1.2"));
     QVERIFY(normalized->isPrefixOf(QStringLiteral("1.2.5")));
     QVERIFY(!normalized->isPrefixOf(QStringLiteral("1.20")));
-}
-
-void tst_VersionNumber::factories()
-{
-    Loomkit loomkit;
     QScopedPointer<VersionNumber> fromParts(loomkit.versionNumber(5, 15, 2));
     QCOMPARE(fromParts->versionString(), QStringLiteral("5.15.2"));
-    QVERIFY(!fromParts->parent());
-    QCOMPARE(QQmlEngine::objectOwnership(fromParts.data()), QQmlEngine::JavaScriptOwnership);
-
-    QScopedPointer<VersionNumber> fromText(loomkit.versionNumber(QStringLiteral("6.2.0-alpha")));
-    QCOMPARE(fromText->microVersion(), 0);
-    QCOMPARE(fromText->suffix(), QStringLiteral("-alpha"));
 
     QTest::ignoreMessage(QtWarningMsg, QRegularExpression("Not a version number"));
     QScopedPointer<VersionNumber> bad(loomkit.versionNumber(QStringLiteral("v1")));

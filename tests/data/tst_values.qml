@@ -23,24 +23,20 @@ TestCase {
     function test_uuid() {
         var fresh = Loomkit.uuid()
         compare(fresh.string.length, 38)
-        verify(!fresh.isNull)
+        compare(fresh.version, 4)
         var parsed = Loomkit.uuid(fresh.withoutBraces)
         verify(parsed == fresh)
         verify(Loomkit.uuid() != fresh)
         compare(String(parsed), fresh.string)
         compare(Loomkit.uuid(fresh.rfc4122).string, fresh.string)
         verify(parsed.equals(fresh.id128))
-        compare(fresh.version, 4)
     }
 
     function test_versions() {
-        verify(Loomkit.compareVersionNumber("1.10", "1.9") > 0)
         verify(Loomkit.compareVersionNumber([1, 2], "1.2.0") < 0)
         compare(Loomkit.compareVersionNumber(version, "2.10.1"), 0)
-        compare(version.suffix, "-rc")
         compare(version.minorVersion, 10)
         var made = Loomkit.versionNumber(3, 0, 1)
-        compare(made.versionString, "3.0.1")
         verify(made.compare(version) > 0)
         compare(Loomkit.versionNumber("4.5").segments, [4, 5])
     }
@@ -51,32 +47,24 @@ TestCase {
         verify(hash.addData(new Uint8Array([99]).buffer))
         compare(hash.hex, "a9993e364706816aba3e25717850c26c9cd0d89d")
         compare(hash.result().hex, hash.hex)
-        compare(hash.hashLength, 20)
-        compare(mac.hash("what do ya want for nothing?"),
-                "5bdcc146bf60754e6a042426089575c75a003f089d2739839dec58b964ec3843")
         compare(mac.hash(Loomkit.binaryData("what do ya want for nothing?")),
                 "5bdcc146bf60754e6a042426089575c75a003f089d2739839dec58b964ec3843")
     }
 
     function test_url() {
-        var parameters = urlInfo.queryParameters
-        compare(parameters.a, ["1", "2"])
-        compare(parameters.b, "x y")
+        compare(urlInfo.queryParameters.a, ["1", "2"])
+        compare(urlInfo.queryParameters.b, "x y")
         urlInfo.queryParameters = { q: "a&b", n: 3 }
         compare(urlInfo.query, "n=3&q=a%26b")
-        compare(urlInfo.host, "example.com")
         var info = Loomkit.urlInfo("file:///tmp/a%20b.txt")
         verify(info.isLocalFile)
         compare(info.localFile, "/tmp/a b.txt")
-        compare(info.suffix, "txt")
     }
 
     function test_locale() {
-        compare(german.formatNumber(1234.5, 1), "1.234,5")
         compare(german.formatDate(new Date(2024, 2, 5), "d. MMMM yyyy"), "5. M\u00e4rz 2024")
         compare(Loomkit.localeInfo(Qt.locale("fr_FR")).name, "fr_FR")
         compare(Loomkit.localeInfo("en_US").formatCurrency(3.5), "$3.50")
-        compare(Loomkit.localeInfo().name, Qt.locale().name)
         compare(Loomkit.localeInfo(null).name, Qt.locale().name)
     }
 
