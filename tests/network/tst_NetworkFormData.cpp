@@ -14,20 +14,25 @@ private slots:
     void initTestCase();
     void filePartWindow_data();
     void filePartWindow();
-    void filePartRewinds();
-    void chainReadsInOrder_data();
-    void chainReadsInOrder();
-    void seekBackAndForward();
-    void progressAndEnd();
-    void abortedStopsAtOnce();
-    void missingFileFails();
-    void fileShrinksUnderRead();
+    void chainReads_data();
+    void chainReads();
+    void progressAndAbort();
+    void badFiles();
 
 private:
     QTemporaryDir m_dir;
     QString m_path;
     QByteArray m_content;
 };
+
+// Reads pieces of `chunk` bytes until a read gives nothing.
+static QByteArray readInPieces(QIODevice *device, int chunk)
+{
+    QByteArray read;
+    for (QByteArray piece = device->read(chunk); !piece.isEmpty(); piece = device->read(chunk))
+        read += piece;
+    return read;
+}
 
 void tst_NetworkFormData::initTestCase()
 {
@@ -68,39 +73,19 @@ void tst_NetworkFormData::filePartWindow()
     NetworkFilePart part(&file, offset, size);
     QVERIFY(!part.isSequential());
     QCOMPARE(part.size(), qint64(count));
-    QCOMPARE(part.pos(), qint64(0));
-    // Read in odd pieces so that the window's end is hit mid-read.
-    QByteArray read;
-    while (!part.atEnd()) {
-        const QByteArray piece = part.read(7);
-        if (piece.isEmpty())
-            break;
-        read += piece;
-    }
-    QCOMPARE(read, m_content.mid(from, count));
-    QTest::ignoreMessage(QtWarningMsg, "QIODevice::write (NetworkFilePart): ReadOnly device");
-    QCOMPARE(part.write("x"), qint64(-1)); // read-only
-}
-
-void tst_NetworkFormData::filePartRewinds()
-{
-    QFile file(m_path);
-    QVERIFY(file.open(QIODevice::ReadOnly));
-    NetworkFilePart part(&file, 200, 300);
-    QCOMPARE(part.readAll(), m_content.mid(200, 300));
+    // Odd pieces hit the window's end mid-read.
+    QCOMPARE(readInPieces(&part, 7), m_content.mid(from, count));
+    QVERIFY(part.atEnd());
+    // Seeks are within the window.
     QVERIFY(part.seek(0));
-    QCOMPARE(part.pos(), qint64(0));
-    QCOMPARE(part.read(10), m_content.mid(200, 10));
-    QVERIFY(part.seek(250));
-    QCOMPARE(part.readAll(), m_content.mid(450, 50));
-
-    NetworkFilePart empty(nullptr, 0, -1);
-    QCOMPARE(empty.size(), qint64(0));
-    QCOMPARE(empty.pos(), qint64(0));
-    QVERIFY(empty.readAll().isEmpty());
+    QCOMPARE(part.readAll(), m_content.mid(from, count));
+    QVERIFY(part.seek(count / 2));
+    QCOMPARE(part.readAll(), m_content.mid(from + count / 2, count - count / 2));
+    QTest::ignoreMessage(QtWarningMsg, "QIODevice::write (NetworkFilePart): ReadOnly device");
+    QCOMPARE(part.write("x"), qint64(-1));
 }
 
-void tst_NetworkFormData::chainReadsInOrder_data()
+void tst_NetworkFormData::chainReads_data()
 {
     QTest::addColumn<int>("chunk");
     QTest::newRow("1") << 1;
@@ -108,7 +93,7 @@ void tst_NetworkFormData::chainReadsInOrder_data()
     QTest::newRow("4096") << 4096;
 }
 
-void tst_NetworkFormData::chainReadsInOrder()
+void tst_NetworkFormData::chainReads()
 {
     QFETCH(int, chunk);
     NetworkFormData body;
@@ -120,48 +105,27 @@ void tst_NetworkFormData::chainReadsInOrder()
     const QByteArray expected = "head\r\n" + m_content + "\r\nmiddle\r\n" + m_content.mid(10, 20) + "--end--\r\n";
     QCOMPARE(body.size(), qint64(expected.size()));
     QVERIFY(!body.isSequential());
-
-    QByteArray read;
-    for (;;) {
-        const QByteArray piece = body.read(chunk);
-        if (piece.isEmpty())
-            break;
-        read += piece;
-    }
-    QCOMPARE(read, expected);
+    QCOMPARE(readInPieces(&body, chunk), expected);
     QCOMPARE(body.pos(), qint64(expected.size()));
     QVERIFY(body.atEnd());
-}
-
-void tst_NetworkFormData::seekBackAndForward()
-{
-    NetworkFormData body;
-    body.appendData("0123456789");
-    body.appendPath(m_path, 500, -1);
-    body.appendData("tail");
-    const QByteArray expected = "0123456789" + m_content.mid(500) + "tail";
-    QCOMPARE(body.readAll(), expected);
 
     // A re-sent request rewinds: everything reads again, files included.
     QVERIFY(body.reset());
-    QCOMPARE(body.pos(), qint64(0));
     QCOMPARE(body.readAll(), expected);
-
-    QVERIFY(body.seek(300));
-    QCOMPARE(body.pos(), qint64(300));
-    QCOMPARE(body.read(20), expected.mid(300, 20));
-    QVERIFY(body.seek(5));
-    QCOMPARE(body.readAll(), expected.mid(5));
+    for (int at : { 300, expected.size() - 25, 5 }) {
+        QVERIFY(body.seek(at));
+        QCOMPARE(body.pos(), qint64(at));
+        QCOMPARE(body.read(20), expected.mid(at, 20));
+    }
 }
 
-void tst_NetworkFormData::progressAndEnd()
+void tst_NetworkFormData::progressAndAbort()
 {
     NetworkFormData body;
     body.appendData(QByteArray(100, 'a'));
     body.appendData(QByteArray(100, 'b'));
     QSignalSpy progressSpy(&body, &NetworkFormData::readProgress);
     QCOMPARE(body.read(150).size(), 150);
-    QVERIFY(progressSpy.count() >= 2);
     QCOMPARE(progressSpy.last().first().toDouble(), 0.75);
     QCOMPARE(body.read(100).size(), 50);
     QCOMPARE(progressSpy.last().first().toDouble(), 1.0);
@@ -170,31 +134,24 @@ void tst_NetworkFormData::progressAndEnd()
     char buffer[8];
     QCOMPARE(body.read(buffer, 8), qint64(0));
     QCOMPARE(progressSpy.last().first().toDouble(), 1.0);
-    QCOMPARE(body.size(), qint64(200));
 
     NetworkFormData empty;
     QSignalSpy emptySpy(&empty, &NetworkFormData::readProgress);
     QVERIFY(empty.readAll().isEmpty());
     QCOMPARE(emptySpy.last().first().toDouble(), 1.0);
 
-    body.clear();
-    QCOMPARE(body.size(), qint64(0));
-    QCOMPARE(body.pos(), qint64(0));
+    // An aborted body stops at once, with full progress.
+    NetworkFormData file;
+    file.appendPath(m_path);
+    QCOMPARE(file.read(10).size(), 10);
+    file.setAborted(true);
+    QSignalSpy abortedSpy(&file, &NetworkFormData::readProgress);
+    QVERIFY(file.read(10).isEmpty());
+    QCOMPARE(abortedSpy.count(), 1);
+    QCOMPARE(abortedSpy.first().first().toDouble(), 1.0);
 }
 
-void tst_NetworkFormData::abortedStopsAtOnce()
-{
-    NetworkFormData body;
-    body.appendPath(m_path);
-    QCOMPARE(body.read(10).size(), 10);
-    body.setAborted(true);
-    QSignalSpy progressSpy(&body, &NetworkFormData::readProgress);
-    QVERIFY(body.read(10).isEmpty());
-    QCOMPARE(progressSpy.count(), 1);
-    QCOMPARE(progressSpy.first().first().toDouble(), 1.0);
-}
-
-void tst_NetworkFormData::missingFileFails()
+void tst_NetworkFormData::badFiles()
 {
     NetworkFormData body;
     QSignalSpy readySpy(&body, &NetworkFormData::readyRead);
@@ -202,22 +159,19 @@ void tst_NetworkFormData::missingFileFails()
     QVERIFY(!body.appendPath(m_dir.path())); // a folder is no file
     QCOMPARE(readySpy.count(), 0);
     QCOMPARE(body.size(), qint64(0));
-}
 
-void tst_NetworkFormData::fileShrinksUnderRead()
-{
+    NetworkFilePart noFile(nullptr, 0, -1);
+    QCOMPARE(noFile.size(), qint64(0));
+    QVERIFY(noFile.readAll().isEmpty());
+
+    // A file that shrinks under the read: what is gone is skipped, and the
+    // read ends instead of waiting.
     const QString path = m_dir.filePath("shrinks.bin");
-    {
-        QFile file(path);
-        QVERIFY(file.open(QIODevice::WriteOnly));
-        file.write(m_content);
-    }
-    NetworkFormData body;
+    QVERIFY(QFile::copy(m_path, path));
     body.appendPath(path, 0, 800);
     body.appendData("after");
     QCOMPARE(body.read(100).size(), 100);
     QVERIFY(QFile::resize(path, 50));
-    // Whatever is gone is skipped; the read ends instead of waiting.
     QByteArray rest;
     for (int i = 0; i < 10; ++i)
         rest += body.read(4096);

@@ -1,22 +1,16 @@
 #include "Loomkit.h"
-#include "NetworkRequest.h"
 #include "NetworkRequestHeaders.h"
 #include "NetworkTestFixture.h"
 #include "NetworkingPrivate.h"
 #include "TestHttpServer.h"
 
-#include <QCryptographicHash>
 #include <QElapsedTimer>
 #include <QFile>
-#include <QJsonDocument>
-#include <QNetworkCookieJar>
+#include <QJsonValue>
 #include <QSignalSpy>
 #include <QTemporaryDir>
-#include <QTest>
 
 QT_WARNING_DISABLE_DEPRECATED
-
-using Headers = QList<QPair<QByteArray, QByteArray>>;
 
 class tst_NetworkRequest : public QObject
 {
@@ -32,19 +26,14 @@ private slots:
     void signalOrderOfAFailedExchange();
     void bodyChoosesEncoding_data();
     void bodyChoosesEncoding();
-    void defaultUserAgent();
+    void headersSent();
     void redirects_data();
     void redirects();
-    void redirectsNotFollowed();
     void responseType_data();
     void responseType();
-    void streamsToResponsePath();
-    void responsePathFallsBackToMemory();
-    void abortRemovesPartialFile();
-    void slowAndChunkedResponses_data();
-    void slowAndChunkedResponses();
-    void serverFaults_data();
-    void serverFaults();
+    void responsePath();
+    void serverBehaviour_data();
+    void serverBehaviour();
     void timeouts_data();
     void timeouts();
     void multipartParts();
@@ -58,17 +47,14 @@ private slots:
     void cookiesMergeIntoJar();
     void basicAuthentication();
     void tlsErrors();
-    void networkLossCompletesEveryLiveRequest();
-    void accessCacheClearingAborts();
+    void outsideEventsEndLiveRequests();
     void abortAndRetry();
     void attributes();
-    void headerInjectionRefused();
 
 private:
     NetworkRequest *request() { return makeRequest(m_engine, m_owner); }
-    static bool waitComplete(NetworkRequest *request, int ms = 10000);
-    static QVariantMap echoOf(NetworkRequest *request);
     QString writeFile(const QString &name, const QByteArray &bytes);
+    void sendAndWait(NetworkRequest *r, const QString &path);
 
     QQmlEngine *m_engine = nullptr;
     QObject *m_owner = nullptr;
@@ -76,16 +62,6 @@ private:
     QTemporaryDir m_dir;
     NetworkingPrivate *m_service = nullptr;
 };
-
-bool tst_NetworkRequest::waitComplete(NetworkRequest *request, int ms)
-{
-    return QTest::qWaitFor([request]() { return request->readyState() == NetworkRequest::ReadyStateComplete; }, ms);
-}
-
-QVariantMap tst_NetworkRequest::echoOf(NetworkRequest *request)
-{
-    return QJsonDocument::fromJson(request->responseText().toUtf8()).toVariant().toMap();
-}
 
 QString tst_NetworkRequest::writeFile(const QString &name, const QByteArray &bytes)
 {
@@ -96,17 +72,11 @@ QString tst_NetworkRequest::writeFile(const QString &name, const QByteArray &byt
     return path;
 }
 
-static QByteArray pattern(int size)
+void tst_NetworkRequest::sendAndWait(NetworkRequest *r, const QString &path)
 {
-    QByteArray bytes(size, Qt::Uninitialized);
-    for (int i = 0; i < size; ++i)
-        bytes[i] = char('a' + (i % 26));
-    return bytes;
-}
-
-static QString sha256(const QByteArray &bytes)
-{
-    return QString::fromLatin1(QCryptographicHash::hash(bytes, QCryptographicHash::Sha256).toHex());
+    r->setUrl(QUrl(m_server->urlFor(path)));
+    r->send();
+    QVERIFY(waitComplete(r));
 }
 
 void tst_NetworkRequest::initTestCase()
@@ -141,9 +111,7 @@ void tst_NetworkRequest::cleanup()
 void tst_NetworkRequest::stateRules()
 {
     NetworkRequest *r = request();
-    QSignalSpy methodSpy(r, &NetworkRequest::methodChanged);
     QSignalSpy stateSpy(r, &NetworkRequest::readyStateChanged);
-
     QTest::ignoreMessage(QtWarningMsg, QRegularExpression("readyState error"));
     r->send();
     QCOMPARE(r->errorText(), QStringLiteral("UNEXPECTED"));
@@ -152,16 +120,13 @@ void tst_NetworkRequest::stateRules()
 
     r->setMethod(QStringLiteral("post"));
     QCOMPARE(r->method(), QStringLiteral("POST"));
-    r->setMethod(QStringLiteral("POST"));
-    QCOMPARE(methodSpy.count(), 1);
-
     r->setUrl(QUrl(m_server->urlFor("/hang")));
     QCOMPARE(r->readyState(), NetworkRequest::ReadyStateInitialized);
     QCOMPARE(stateSpy.count(), 1);
     r->send();
     QCOMPARE(r->readyState(), NetworkRequest::ReadyStateSending);
 
-    // While sending, url, method and open are refused.
+    // While sending, url, method, open and send are refused.
     r->setUrl(QUrl(m_server->urlFor("/echo")));
     r->setMethod(QStringLiteral("GET"));
     r->open(QStringLiteral("PUT"), QUrl(m_server->urlFor("/other")));
@@ -173,15 +138,10 @@ void tst_NetworkRequest::stateRules()
     QCOMPARE(r->readyState(), NetworkRequest::ReadyStateSending);
 
     r->abort();
-    QCOMPARE(r->readyState(), NetworkRequest::ReadyStateComplete);
-    // The same URL again leaves state 4, from which send is accepted.
+    // The same URL again leaves state 4; another one goes back to 1.
     r->open(QStringLiteral("GET"), QUrl(m_server->urlFor("/hang")));
     QCOMPARE(r->readyState(), NetworkRequest::ReadyStateComplete);
-    r->setUrl(QUrl(m_server->urlFor("/echo")));
-    QCOMPARE(r->readyState(), NetworkRequest::ReadyStateInitialized);
-    r->send();
-    QVERIFY(waitComplete(r));
-    QCOMPARE(r->status(), 200);
+    sendAndWait(r, "/echo");
     QCOMPARE(r->statusText(), QStringLiteral("200 OK"));
 }
 
@@ -193,7 +153,6 @@ void tst_NetworkRequest::signalOrderOfOneExchange()
     r->send();
     QVERIFY(waitComplete(r));
     QCOMPARE(r->errorCode(), 0);
-    QCOMPARE(r->responseText().size(), 5000);
     QCOMPARE(r->progress(), 1.0);
 
     const QStringList &names = recorder.names;
@@ -204,36 +163,31 @@ void tst_NetworkRequest::signalOrderOfOneExchange()
     // The finish: headers again, then progress only if the chunks left it
     // below 1.0, then the response and state 4.
     const QStringList end = names.mid(names.lastIndexOf("responseHeadersChanged"));
-    QCOMPARE(end.first(), QStringLiteral("responseHeadersChanged"));
     QCOMPARE(end.mid(end.size() - 2), QStringList({ "responseChanged", "readyStateChanged" }));
     QVERIFY(end.size() <= 5);
     QVERIFY(!names.contains("error"));
-    QVERIFY(!names.contains("requestBodyChanged"));
 }
 
 void tst_NetworkRequest::signalOrderOfAFailedExchange()
 {
     NetworkRequest *r = request();
-    r->setUrl(QUrl(m_server->urlFor("/status?code=404")));
-    r->send();
-    QVERIFY(waitComplete(r));
+    sendAndWait(r, "/status?code=404");
     QCOMPARE(r->status(), 404);
     QCOMPARE(r->errorCode(), int(QNetworkReply::ContentNotFoundError));
     QCOMPARE(r->responseText(), QStringLiteral("status 404"));
 
-    // The next exchange clears the error ahead of state 2.
+    // The next exchange clears the error ahead of state 2; progress goes
+    // back from 1.0 to 0.0, hence a second progressChanged.
     SignalRecorder recorder(r);
     r->send(QStringLiteral("body"));
-    // progress goes back from 1.0 to 0.0: a second progressChanged.
     const QStringList start = { "requestBodyChanged", "responseHeadersChanged", "progressChanged",
                                 "progressChanged", "responseChanged", "responseTextChanged", "errorCodeChanged",
                                 "errorTextChanged", "readyStateChanged" };
     QCOMPARE(recorder.names, start);
     QVERIFY(waitComplete(r));
-    const QStringList &names = recorder.names;
     const QStringList end = { "errorCodeChanged", "errorTextChanged", "responseChanged", "error", "readyStateChanged" };
-    QCOMPARE(names.mid(names.size() - end.size()), end);
-    QCOMPARE(names.count("error"), 1);
+    QCOMPARE(recorder.names.mid(recorder.names.size() - end.size()), end);
+    QCOMPARE(recorder.names.count("error"), 1);
 }
 
 void tst_NetworkRequest::bodyChoosesEncoding_data()
@@ -246,23 +200,19 @@ void tst_NetworkRequest::bodyChoosesEncoding_data()
     QTest::addColumn<QString>("sentBody");
     QTest::addColumn<QString>("contentType");
 
-    QVariantMap formA;
-    formA.insert("a", 1);
-    QVariantMap blank;
-    blank.insert("a", "x y");
-    QTest::newRow("GET form wins over query") << "GET" << "/echo?a=2&b=3" << QVariant(formA)
-                                              << "GET" << "/echo?a=1&b=3" << "" << "";
-    QTest::newRow("POST form urlencoded") << "post" << "/echo" << QVariant(blank)
-                                          << "POST" << "/echo" << "a=x%20y" << "application/x-www-form-urlencoded";
-    QTest::newRow("POST moves query into body") << "POST" << "/echo?z=9" << QVariant(formA)
-                                                << "POST" << "/echo" << "a=1&z=9" << "application/x-www-form-urlencoded";
+    const QVariant form(QVariantMap { { "a", 1 } });
+    const QString urlencoded = QStringLiteral("application/x-www-form-urlencoded");
+    QTest::newRow("GET form wins over query") << "GET" << "/echo?a=2&b=3" << form << "GET" << "/echo?a=1&b=3" << "" << "";
+    QTest::newRow("POST form urlencoded") << "post" << "/echo" << QVariant(QVariantMap { { "a", "x y" } }) << "POST"
+                                          << "/echo" << "a=x%20y" << urlencoded;
+    QTest::newRow("POST moves query into body") << "POST" << "/echo?z=9" << form << "POST" << "/echo" << "a=1&z=9"
+                                                << urlencoded;
     QTest::newRow("POST JSON-looking string as is") << "POST" << "/echo" << QVariant(QStringLiteral("{\"k\":1}"))
-                                                    << "POST" << "/echo" << "{\"k\":1}"
-                                                    << "application/x-www-form-urlencoded";
-    QTest::newRow("PUT form") << "PUT" << "/echo" << QVariant(formA) << "PUT" << "/echo" << "a=1" << "";
-    QTest::newRow("DELETE form") << "DELETE" << "/echo" << QVariant(formA) << "DELETE" << "/echo" << "a=1" << "";
+                                                    << "POST" << "/echo" << "{\"k\":1}" << urlencoded;
+    QTest::newRow("PUT form") << "PUT" << "/echo" << form << "PUT" << "/echo" << "a=1" << "";
+    QTest::newRow("DELETE form") << "DELETE" << "/echo" << form << "DELETE" << "/echo" << "a=1" << "";
     QTest::newRow("DELETE plain") << "DELETE" << "/echo" << QVariant() << "DELETE" << "/echo" << "" << "";
-    QTest::newRow("custom verb becomes GET") << "PATCH" << "/echo" << QVariant(formA) << "GET" << "/echo?a=1" << "" << "";
+    QTest::newRow("custom verb becomes GET") << "PATCH" << "/echo" << form << "GET" << "/echo?a=1" << "" << "";
     QTest::newRow("GET null body") << "GET" << "/echo?q=1" << QVariant() << "GET" << "/echo?q=1" << "" << "";
 }
 
@@ -286,100 +236,83 @@ void tst_NetworkRequest::bodyChoosesEncoding()
     QCOMPARE(QString::fromUtf8(sent.target), sentTarget);
     QCOMPARE(QString::fromUtf8(sent.body), sentBody);
     QCOMPARE(QString::fromUtf8(sent.header("Content-Type")), contentType);
-    QCOMPARE(r->requestBody(), body);
 }
 
-void tst_NetworkRequest::defaultUserAgent()
+void tst_NetworkRequest::headersSent()
 {
     Loomkit::current()->setProperty("Orvane.Loomkit.Networking.defaultUserAgent", QStringLiteral("Framework/1.0"));
     NetworkRequest *r = request();
-    r->setUrl(QUrl(m_server->urlFor("/echo")));
-    r->send();
-    QVERIFY(waitComplete(r));
+    sendAndWait(r, "/echo");
     QCOMPARE(m_server->requests().last().header("User-Agent"), QByteArray("Framework/1.0"));
 
+    // The request's own agent wins; a value that would start another header
+    // is skipped on its own.
     r->headers()->setUserAgent(QStringLiteral("Own/2.0"));
-    r->headers()->setValue(QStringLiteral("X-Extra"), QStringLiteral("yes"));
+    r->headers()->setValue(QStringLiteral("X-Evil"), QStringLiteral("a\r\nX-Injected: 1"));
+    r->headers()->setValue(QStringLiteral("X-Good"), QStringLiteral("fine"));
+    QTest::ignoreMessage(QtWarningMsg, QRegularExpression("Skipping header"));
     r->send();
     QVERIFY(waitComplete(r));
-    QCOMPARE(m_server->requests().last().header("User-Agent"), QByteArray("Own/2.0"));
-    QCOMPARE(m_server->requests().last().header("X-Extra"), QByteArray("yes"));
+    const TestHttpRequest sent = m_server->requests().last();
+    QCOMPARE(sent.header("User-Agent"), QByteArray("Own/2.0"));
+    QCOMPARE(sent.header("X-Good"), QByteArray("fine"));
+    QVERIFY(sent.header("X-Injected").isEmpty());
+    QVERIFY(sent.header("X-Evil").isEmpty());
 }
 
 void tst_NetworkRequest::redirects_data()
 {
-    QTest::addColumn<int>("code");
+    QTest::addColumn<QString>("path");
     QTest::addColumn<QString>("method");
-    // A POST form would move the query into the body; the POST rows send
-    // a text body so that the redirect route keeps its query.
+    QTest::addColumn<bool>("follow");
+    QTest::addColumn<int>("status");
+    QTest::addColumn<int>("hops");
     for (int code : { 301, 302, 303, 305, 307, 308 }) {
-        QTest::addRow("POST %d", code) << code << "POST";
-        QTest::addRow("GET %d", code) << code << "GET";
+        const QString path = QStringLiteral("/redirect?code=%1&to=/echo%3Fkept%3D1").arg(code);
+        QTest::addRow("POST %d", code) << path << "POST" << true << 200 << 2;
+        QTest::addRow("GET %d", code) << path << "GET" << true << 200 << 2;
     }
+    QTest::newRow("not followed") << "/redirect?code=302&to=/echo" << "GET" << false << 302 << 1;
+    QTest::newRow("no location") << "/redirect?code=301" << "GET" << true << 301 << 1;
+    QTest::newRow("304 is no redirect") << "/status?code=304" << "GET" << true << 304 << 1;
 }
 
 void tst_NetworkRequest::redirects()
 {
-    QFETCH(int, code);
+    QFETCH(QString, path);
     QFETCH(QString, method);
+    QFETCH(bool, follow);
+    QFETCH(int, status);
+    QFETCH(int, hops);
 
     NetworkRequest *r = request();
-    QVariantMap form;
-    form.insert("field", "value");
-    r->open(method, QUrl(m_server->urlFor(QStringLiteral("/redirect?code=%1&to=/echo%3Fkept%3D1").arg(code))));
-    QSignalSpy stateSpy(r, &NetworkRequest::readyStateChanged);
+    r->setFollowRedirects(follow);
+    const QUrl url(m_server->urlFor(path));
+    r->open(method, url);
     QList<double> progressSeen;
     connect(r, &NetworkRequest::progressChanged, r, [&]() { progressSeen.append(r->progress()); });
-    if (method == QLatin1String("POST"))
-        r->send(QStringLiteral("field=value"));
-    else
-        r->send(form);
+    // A POST form would move the query into the body; a text body keeps the
+    // redirect route's query.
+    const bool post = method == QLatin1String("POST");
+    r->send(post ? QVariant(QStringLiteral("field=value")) : QVariant(QVariantMap { { "field", "value" } }));
     QVERIFY(waitComplete(r));
-    QCOMPARE(r->status(), 200);
-    QCOMPARE(r->url(), QUrl(m_server->urlFor(QStringLiteral("/redirect?code=%1&to=/echo%3Fkept%3D1").arg(code))));
-    QVERIFY(!r->responseText().contains("redirect body"));
-    // Nothing of the hop shows as progress: 0 until the final jump.
+    QCOMPARE(r->status(), status);
+    QCOMPARE(r->url(), url);
+    QCOMPARE(r->responseText().contains("redirect body"), status == 301 || status == 302);
+    QCOMPARE(m_server->requestCount(), hops);
+    // Nothing of a hop shows as progress: 0 until the final jump.
     QCOMPARE(progressSeen.last(), 1.0);
     for (int i = 0; i < progressSeen.size() - 1; ++i)
         QVERIFY2(progressSeen.at(i) == 0.0 || progressSeen.at(i) > 0.5, qPrintable(QString::number(progressSeen.at(i))));
-
-    QCOMPARE(m_server->requestCount(), 2);
+    if (hops == 1)
+        return;
     const TestHttpRequest second = m_server->requests().at(1);
     QCOMPARE(QString::fromLatin1(second.method), method);
-    if (method == QLatin1String("POST")) {
+    // POST keeps its body; GET loses its form but keeps the location's query.
+    if (post)
         QCOMPARE(second.body, QByteArray("field=value"));
-    } else {
-        // The form is gone; what the location carries stays.
+    else
         QCOMPARE(second.target, QByteArray("/echo?kept=1"));
-    }
-}
-
-void tst_NetworkRequest::redirectsNotFollowed()
-{
-    NetworkRequest *r = request();
-    r->setFollowRedirects(false);
-    QVERIFY(!r->followRedirects());
-    r->setUrl(QUrl(m_server->urlFor("/redirect?code=302&to=/echo")));
-    r->send();
-    QVERIFY(waitComplete(r));
-    QCOMPARE(r->status(), 302);
-    QCOMPARE(r->responseText(), QStringLiteral("redirect body"));
-    QCOMPARE(m_server->requestCount(), 1);
-
-    // A redirect status without a location ends like any response.
-    r->setFollowRedirects(true);
-    r->setUrl(QUrl(m_server->urlFor("/redirect?code=301")));
-    r->send();
-    QVERIFY(waitComplete(r));
-    QCOMPARE(r->status(), 301);
-    QCOMPARE(m_server->requestCount(), 2);
-
-    // 304 is not a redirect.
-    r->setUrl(QUrl(m_server->urlFor("/status?code=304")));
-    r->send();
-    QVERIFY(waitComplete(r));
-    QCOMPARE(r->status(), 304);
-    QCOMPARE(m_server->requestCount(), 3);
 }
 
 void tst_NetworkRequest::responseType_data()
@@ -388,16 +321,12 @@ void tst_NetworkRequest::responseType_data()
     QTest::addColumn<QString>("body");
     QTest::addColumn<QVariant>("expected");
 
-    QVariantMap withNull;
-    withNull.insert("a", 1);
-    withNull.insert("b", QVariant::fromValue(nullptr));
-    QVariantMap plain;
-    plain.insert("a", 1);
-    plain.insert("b", "x");
+    const QVariantMap plain { { "a", 1 }, { "b", "x" } };
+    const QVariantMap withNull { { "a", 1 }, { "b", QVariant::fromValue(nullptr) } };
     QTest::newRow("json") << "json" << "{\"a\":1,\"b\":\"x\"}" << QVariant(plain);
     QTest::newRow("JSON in capitals") << "JSON" << "{\"a\":1,\"b\":\"x\"}" << QVariant(plain);
-    QTest::newRow("json with null") << "json" << "{\"a\":1,\"b\":NULL}" << QVariant(QVariantMap());
-    QTest::newRow("json with null ok") << "json" << "{\"a\":1,\"b\":null}" << QVariant(withNull);
+    QTest::newRow("json with NULL") << "json" << "{\"a\":1,\"b\":NULL}" << QVariant(QVariantMap());
+    QTest::newRow("json with null") << "json" << "{\"a\":1,\"b\":null}" << QVariant(withNull);
     QTest::newRow("json array") << "json" << "[1,2]" << QVariant(QVariantList { 1, 2 });
     QTest::newRow("json empty") << "json" << "" << QVariant();
     QTest::newRow("base64") << "base64" << "hi!" << QVariant(QStringLiteral("aGkh"));
@@ -415,45 +344,26 @@ void tst_NetworkRequest::responseType()
 
     NetworkRequest *r = request();
     r->setResponseType(responseType);
-    r->setUrl(QUrl(m_server->urlFor("/text?body=" + QString::fromLatin1(QUrl::toPercentEncoding(body)))));
     QSignalSpy responseSpy(r, &NetworkRequest::responseChanged);
-    r->send();
-    QVERIFY(waitComplete(r));
+    sendAndWait(r, "/text?body=" + QString::fromLatin1(QUrl::toPercentEncoding(body)));
     QCOMPARE(responseSpy.count(), 2); // the reset and the finish
-    const QVariant response = r->response();
-    if (expected.userType() == QMetaType::QVariantMap) {
-        const QVariantMap map = response.toMap();
-        const QVariantMap wanted = expected.toMap();
-        QCOMPARE(map.keys(), wanted.keys());
-        for (const QString &key : wanted.keys()) {
-            QCOMPARE(map.value(key).isNull(), wanted.value(key).isNull());
-            if (!wanted.value(key).isNull())
-                QCOMPARE(map.value(key).toString(), wanted.value(key).toString());
-        }
-    } else if (expected.isValid()) {
-        QCOMPARE(response.userType(), expected.userType());
-        QCOMPARE(response, expected);
-    } else {
-        QVERIFY(!response.isValid());
-    }
+    QCOMPARE(r->response().userType(), expected.userType());
+    // Through JSON so that a null inside a map compares as null.
+    QVERIFY(QJsonValue::fromVariant(r->response()) == QJsonValue::fromVariant(expected));
 }
 
-void tst_NetworkRequest::streamsToResponsePath()
+void tst_NetworkRequest::responsePath()
 {
     const int size = 3 * 1024 * 1024 + 17;
     NetworkRequest *r = request();
-    const QString path = m_dir.filePath("download.bin");
-    writeFile("download.bin", "old content that must go");
+    const QString path = writeFile("download.bin", "old content that must go");
     r->setResponsePath(path);
-    r->setUrl(QUrl(m_server->urlFor(QStringLiteral("/bytes?size=%1").arg(size))));
     QList<double> progress;
     connect(r, &NetworkRequest::progressChanged, r, [&]() { progress.append(r->progress()); });
-    r->send();
-    QVERIFY(waitComplete(r));
+    sendAndWait(r, QStringLiteral("/bytes?size=%1").arg(size));
     QCOMPARE(r->errorCode(), 0);
     QFile file(path);
     QVERIFY(file.open(QIODevice::ReadOnly));
-    QCOMPARE(file.size(), qint64(size));
     QCOMPARE(sha256(file.readAll()), sha256(pattern(size)));
     QVERIFY(!r->response().isValid());
     QVERIFY(r->responseText().isEmpty());
@@ -461,102 +371,70 @@ void tst_NetworkRequest::streamsToResponsePath()
     for (int i = 1; i < progress.size(); ++i)
         QVERIFY(progress.at(i) >= progress.at(i - 1) || progress.at(i) == 0.0);
     QVERIFY(std::any_of(progress.cbegin(), progress.cend(), [](double p) { return p > 0.5 && p < 1.0; }));
-}
 
-void tst_NetworkRequest::responsePathFallsBackToMemory()
-{
-    NetworkRequest *r = request();
-    // A folder cannot be opened as a file.
-    r->setResponsePath(m_dir.path());
-    r->setUrl(QUrl(m_server->urlFor("/bytes?size=100")));
-    QSignalSpy errorTextSpy(r, &NetworkRequest::errorTextChanged);
-    QTest::ignoreMessage(QtWarningMsg, QRegularExpression("Cannot open .*Is a directory"));
-    r->send();
-    QVERIFY(waitComplete(r));
-    QVERIFY(QFileInfo(m_dir.path()).isDir());
-    QCOMPARE(r->responseText(), QString::fromLatin1(pattern(100)));
-    QVERIFY(errorTextSpy.count() >= 2);
-    QCOMPARE(errorTextSpy.at(0).size(), 0);
-    QCOMPARE(r->errorText(), QString()); // cleared by the good finish
-    QCOMPARE(r->errorCode(), 0);
-}
-
-void tst_NetworkRequest::abortRemovesPartialFile()
-{
-    NetworkRequest *r = request();
-    const QString path = m_dir.filePath("partial.bin");
-    r->setResponsePath(path);
+    // An abort removes the partial file; the path cannot change under it.
+    QVERIFY(QFile::remove(path));
     r->setUrl(QUrl(m_server->urlFor("/slow?size=2000&pieces=20&interval=50")));
     r->send();
     QVERIFY(QTest::qWaitFor([&]() { return QFile::exists(path); }, 5000));
-    // The path cannot change under an open file.
     r->setResponsePath(m_dir.filePath("other.bin"));
     QCOMPARE(r->errorText(), QStringLiteral("Error: responsePath cannot be set when file is open"));
     QCOMPARE(r->responsePath(), path);
     r->abort();
-    QVERIFY(waitComplete(r));
     QCOMPARE(r->errorCode(), int(QNetworkReply::OperationCanceledError));
     QVERIFY(!QFile::exists(path));
 
     // A failure that was not an abort keeps what arrived.
-    r->setUrl(QUrl(m_server->urlFor("/truncate?size=4000")));
-    r->send();
-    QVERIFY(waitComplete(r));
+    sendAndWait(r, "/truncate?size=4000");
     QVERIFY(r->errorCode() != 0);
-    QVERIFY(QFile::exists(path));
     QCOMPARE(QFileInfo(path).size(), qint64(2000));
+
+    // A folder cannot be opened as a file: the response stays in memory.
+    r->setResponsePath(m_dir.path());
+    QTest::ignoreMessage(QtWarningMsg, QRegularExpression("Cannot open .*Is a directory"));
+    sendAndWait(r, "/bytes?size=100");
+    QVERIFY(QFileInfo(m_dir.path()).isDir());
+    QCOMPARE(r->responseText(), QString::fromLatin1(pattern(100)));
+    QCOMPARE(r->errorText(), QString()); // cleared by the good finish
 }
 
-void tst_NetworkRequest::slowAndChunkedResponses_data()
+void tst_NetworkRequest::serverBehaviour_data()
 {
+    // size -1: the exchange must end in an error.
     QTest::addColumn<QString>("path");
     QTest::addColumn<int>("size");
     QTest::newRow("slow") << "/slow?size=3000&pieces=10&interval=20" << 3000;
     QTest::newRow("chunked") << "/chunked?size=100000&pieces=37" << 100000;
     QTest::newRow("empty") << "/bytes?size=0" << 0;
+    QTest::newRow("refused") << "refused" << -1;
+    QTest::newRow("reset") << "/reset" << -1;
+    QTest::newRow("truncated") << "/truncate?size=1000" << -1;
+    QTest::newRow("closed mid-body") << "/close" << -1;
+    QTest::newRow("garbage") << "/garbage" << -1;
 }
 
-void tst_NetworkRequest::slowAndChunkedResponses()
+void tst_NetworkRequest::serverBehaviour()
 {
     QFETCH(QString, path);
     QFETCH(int, size);
-    NetworkRequest *r = request();
-    r->setUrl(QUrl(m_server->urlFor(path)));
-    r->setResponseType(QStringLiteral("binary"));
-    r->send();
-    QVERIFY(waitComplete(r));
-    QCOMPARE(r->errorCode(), 0);
-    QCOMPARE(r->response().toByteArray(), pattern(size));
-    QCOMPARE(r->progress(), 1.0);
-}
-
-void tst_NetworkRequest::serverFaults_data()
-{
-    QTest::addColumn<QString>("path");
-    QTest::newRow("refused") << "refused";
-    QTest::newRow("reset") << "/reset";
-    QTest::newRow("truncated") << "/truncate?size=1000";
-    QTest::newRow("closed mid-body") << "/close";
-    QTest::newRow("garbage") << "/garbage";
-}
-
-void tst_NetworkRequest::serverFaults()
-{
-    QFETCH(QString, path);
-    QUrl url;
+    QUrl url(m_server->urlFor(path));
     if (path == QLatin1String("refused")) {
-        // A port that was just free.
-        QTcpServer probe;
+        QTcpServer probe; // a port that was just free
         QVERIFY(probe.listen(QHostAddress::LocalHost, 0));
         url = QUrl(QStringLiteral("http://127.0.0.1:%1/").arg(probe.serverPort()));
-    } else {
-        url = QUrl(m_server->urlFor(path));
     }
     NetworkRequest *r = request();
     r->setUrl(url);
+    r->setResponseType(QStringLiteral("binary"));
     QSignalSpy errorSpy(r, &NetworkRequest::error);
     r->send();
     QVERIFY(waitComplete(r));
+    if (size >= 0) {
+        QCOMPARE(r->errorCode(), 0);
+        QCOMPARE(r->response().toByteArray(), pattern(size));
+        QCOMPARE(r->progress(), 1.0);
+        return;
+    }
     QVERIFY2(r->errorCode() != 0, qPrintable(r->errorText()));
     QVERIFY(!r->errorText().isEmpty());
     QCOMPARE(errorSpy.count(), 1);
@@ -587,24 +465,18 @@ void tst_NetworkRequest::timeouts()
     Loomkit::current()->setProperty("Orvane.Loomkit.Networking.timeout", framework);
     NetworkRequest *r = request();
     r->setTimeout(own);
-    // Slower than the timeouts above, yet it ends by itself.
-    r->setUrl(QUrl(m_server->urlFor("/slow?size=10&pieces=2&interval=700")));
     QSignalSpy timeoutSpy(r, &NetworkRequest::timeout);
     QSignalSpy errorSpy(r, &NetworkRequest::error);
     QElapsedTimer clock;
     clock.start();
-    r->send();
-    QVERIFY(waitComplete(r));
+    // Slower than the timeouts above, yet it ends by itself.
+    sendAndWait(r, "/slow?size=10&pieces=2&interval=700");
     QCOMPARE(timeoutSpy.count(), timesOut ? 1 : 0);
-    if (timesOut) {
+    QCOMPARE(errorSpy.count(), timesOut ? 1 : 0);
+    QCOMPARE(r->errorCode(), timesOut ? int(QNetworkReply::OperationCanceledError) : 0);
+    QCOMPARE(r->responseText(), timesOut ? QString() : QStringLiteral("abcdefghij"));
+    if (timesOut)
         QVERIFY(clock.elapsed() < 1200);
-        QCOMPARE(r->errorCode(), int(QNetworkReply::OperationCanceledError));
-        QCOMPARE(errorSpy.count(), 1);
-        QVERIFY(r->responseText().isEmpty());
-    } else {
-        QCOMPARE(r->errorCode(), 0);
-        QCOMPARE(r->responseText(), QStringLiteral("abcdefghij"));
-    }
 }
 
 void tst_NetworkRequest::multipartParts()
@@ -614,15 +486,11 @@ void tst_NetworkRequest::multipartParts()
     const QString notesPath = writeFile("notes.bin", "notes");
     NetworkRequest *r = request();
     r->headers()->setValue(QStringLiteral("Content-Type"), QStringLiteral("text/wrong"));
-    QVariantMap form;
-    form.insert("title", QString::fromUtf8("Gr\xc3\xbc\xc3\x9f"));
-    form.insert("count", 3);
-    form.insert("photo", "@" + photoPath);
+    QVariantMap form { { "title", QString::fromUtf8("Gr\xc3\xbc\xc3\x9f") }, { "count", 3 }, { "photo", "@" + photoPath } };
     form.insert("notes", "@" + notesPath + ";type=text/x-notes;filename=renamed.txt");
     r->open(QStringLiteral("POST"), QUrl(m_server->urlFor("/echo?x=1")));
     r->send(form);
     QVERIFY(waitComplete(r));
-    QCOMPARE(r->errorCode(), 0);
     const QVariantMap echo = echoOf(r);
     QVERIFY(echo.value("multipartWellFormed").toBool());
     QCOMPARE(echo.value("target").toString(), QStringLiteral("/echo?x=1"));
@@ -631,24 +499,17 @@ void tst_NetworkRequest::multipartParts()
     // The script's header is replaced for this exchange only.
     QCOMPARE(r->headers()->value(QStringLiteral("Content-Type")).toString(), QStringLiteral("text/wrong"));
 
+    // Plain values first, then files, each in key order.
     const QVariantList parts = echo.value("parts").toList();
     QCOMPARE(parts.size(), 4);
-    // Plain values first, then files, each in key order.
-    QCOMPARE(parts.at(0).toMap().value("name").toString(), QStringLiteral("count"));
-    QCOMPARE(parts.at(0).toMap().value("text").toString(), QStringLiteral("3"));
+    const auto part = [&](int i, const char *key) { return parts.at(i).toMap().value(key).toString(); };
+    QCOMPARE(part(0, "name") + '=' + part(0, "text"), QStringLiteral("count=3"));
     QVERIFY(!parts.at(0).toMap().contains("filename"));
-    QCOMPARE(parts.at(1).toMap().value("name").toString(), QStringLiteral("title"));
-    QCOMPARE(parts.at(1).toMap().value("text").toString(), QString::fromUtf8("Gr\xc3\xbc\xc3\x9f"));
-    const QVariantMap notes = parts.at(2).toMap();
-    QCOMPARE(notes.value("name").toString(), QStringLiteral("notes"));
-    QCOMPARE(notes.value("filename").toString(), QStringLiteral("renamed.txt"));
-    QCOMPARE(notes.value("contentType").toString(), QStringLiteral("text/x-notes"));
-    QCOMPARE(notes.value("text").toString(), QStringLiteral("notes"));
-    const QVariantMap photoPart = parts.at(3).toMap();
-    QCOMPARE(photoPart.value("filename").toString(), QStringLiteral("photo.png"));
-    QCOMPARE(photoPart.value("contentType").toString(), QStringLiteral("image/png"));
-    QCOMPARE(photoPart.value("size").toInt(), photo.size());
-    QCOMPARE(photoPart.value("sha256").toString(), sha256(photo));
+    QCOMPARE(part(1, "name") + '=' + part(1, "text"), QString::fromUtf8("title=Gr\xc3\xbc\xc3\x9f"));
+    QCOMPARE(QStringList({ part(2, "name"), part(2, "filename"), part(2, "contentType"), part(2, "text") }),
+             QStringList({ "notes", "renamed.txt", "text/x-notes", "notes" }));
+    QCOMPARE(QStringList({ part(3, "name"), part(3, "filename"), part(3, "contentType"), part(3, "sha256") }),
+             QStringList({ "photo", "photo.png", "image/png", sha256(photo) }));
 }
 
 void tst_NetworkRequest::multipartSlices_data()
@@ -675,9 +536,7 @@ void tst_NetworkRequest::multipartSlices()
     const QString path = writeFile("slice.bin", content);
     NetworkRequest *r = request();
     r->open(QStringLiteral("POST"), QUrl(m_server->urlFor("/echo")));
-    QVariantMap form;
-    form.insert("part", "@" + path + parameters);
-    r->send(form);
+    r->send(QVariantMap { { "part", "@" + path + parameters } });
     QVERIFY(waitComplete(r));
     const QVariantMap echo = echoOf(r);
     QVERIFY(echo.value("multipartWellFormed").toBool());
@@ -685,8 +544,6 @@ void tst_NetworkRequest::multipartSlices()
     QCOMPARE(parts.size(), 1);
     QCOMPARE(parts.first().toMap().value("size").toInt(), size);
     QCOMPARE(parts.first().toMap().value("sha256").toString(), sha256(content.mid(offset, size)));
-    // A body that starts with a file part.
-    QVERIFY(echo.value("body").toString().startsWith("-----------------------------"));
 }
 
 void tst_NetworkRequest::multipartMissingFile()
@@ -694,16 +551,14 @@ void tst_NetworkRequest::multipartMissingFile()
     NetworkRequest *r = request();
     r->open(QStringLiteral("POST"), QUrl(m_server->urlFor("/echo")));
     const QString missing = m_dir.filePath("missing.bin");
-    QVariantMap form;
-    form.insert("file", "@" + missing);
-    QSignalSpy errorSpy(r, &NetworkRequest::error);
     SignalRecorder recorder(r);
-    r->send(form);
+    r->send(QVariantMap { { "file", "@" + missing } });
+    // It ends at once, in state 4, without reaching the server.
     QCOMPARE(r->readyState(), NetworkRequest::ReadyStateComplete);
     QCOMPARE(r->errorCode(), -1);
     QCOMPARE(r->errorText(), QStringLiteral("Cannot open %1").arg(missing));
-    QCOMPARE(errorSpy.count(), 1);
     QCOMPARE(recorder.names.count("readyStateChanged"), 2);
+    QCOMPARE(recorder.names.count("error"), 1);
     QCOMPARE(recorder.names.mid(recorder.names.size() - 4),
              QStringList({ "errorCodeChanged", "errorTextChanged", "error", "readyStateChanged" }));
     QTest::qWait(50);
@@ -723,11 +578,9 @@ void tst_NetworkRequest::multipartVerbs()
 {
     QFETCH(QString, method);
     QFETCH(QString, sent);
-    const QString path = writeFile("verb.txt", "x");
+    const QVariantMap form { { "f", "@" + writeFile("verb.txt", "x") } };
     NetworkRequest *r = request();
     r->open(method, QUrl(m_server->urlFor("/echo")));
-    QVariantMap form;
-    form.insert("f", "@" + path);
     r->send(form);
     QVERIFY(waitComplete(r));
     QCOMPARE(echoOf(r).value("method").toString(), sent);
@@ -745,9 +598,7 @@ void tst_NetworkRequest::multipartRedirectRereadsFiles()
     const QString path = writeFile("again.bin", content);
     NetworkRequest *r = request();
     r->open(QStringLiteral("POST"), QUrl(m_server->urlFor("/redirect?code=307&to=/echo")));
-    QVariantMap form;
-    form.insert("f", "@" + path + ";offset=10");
-    r->send(form);
+    r->send(QVariantMap { { "f", "@" + path + ";offset=10" } });
     QVERIFY(waitComplete(r));
     QCOMPARE(m_server->requestCount(), 2);
     // Both hops carried the whole body.
@@ -764,14 +615,13 @@ void tst_NetworkRequest::multipartProgress()
     r->open(QStringLiteral("POST"), QUrl(m_server->urlFor("/bytes?size=200000")));
     QList<double> progress;
     connect(r, &NetworkRequest::progressChanged, r, [&]() { progress.append(r->progress()); });
-    QVariantMap form;
-    form.insert("f", "@" + path);
-    r->send(form);
+    r->send(QVariantMap { { "f", "@" + path } });
     QVERIFY(waitComplete(r, 20000));
     QCOMPARE(r->errorCode(), 0);
-    QVERIFY(progress.contains(0.5));
+    // The upload fills the first half, the download the second.
     QVERIFY(std::any_of(progress.cbegin(), progress.cend(), [](double p) { return p > 0.0 && p < 0.5; }));
     const int reachedHalf = progress.indexOf(0.5);
+    QVERIFY(reachedHalf >= 0);
     for (int i = reachedHalf; i < progress.size(); ++i)
         QVERIFY(progress.at(i) >= 0.5);
     QCOMPARE(progress.last(), 1.0);
@@ -780,25 +630,20 @@ void tst_NetworkRequest::multipartProgress()
 void tst_NetworkRequest::cookiesMergeIntoJar()
 {
     NetworkRequest *r = request();
-    r->setUrl(QUrl(m_server->urlFor("/cookies?set=sid=old")));
-    r->send();
-    QVERIFY(waitComplete(r));
+    sendAndWait(r, "/cookies?set=sid=old");
     QVERIFY(r->responseHeaders().value("Set-Cookie").toString().startsWith("sid=old"));
 
     // The script's cookie takes the jar's value by name; no header of ours.
     r->headers()->setValue(QStringLiteral("Cookie"), QStringLiteral("sid=new"));
-    r->setUrl(QUrl(m_server->urlFor("/cookies")));
-    r->send();
-    QVERIFY(waitComplete(r));
+    sendAndWait(r, "/cookies");
     QCOMPARE(r->responseText(), QStringLiteral("sid=new"));
 
     r->headers()->setValue(QStringLiteral("Cookie"), QStringLiteral("extra=1"));
     r->send();
     QVERIFY(waitComplete(r));
-    const QStringList cookies = r->responseText().split(QStringLiteral("; "));
-    QCOMPARE(cookies.size(), 2);
-    QVERIFY(cookies.contains("sid=new"));
-    QVERIFY(cookies.contains("extra=1"));
+    QStringList cookies = r->responseText().split(QStringLiteral("; "));
+    cookies.sort();
+    QCOMPARE(cookies, QStringList({ "extra=1", "sid=new" }));
 }
 
 void tst_NetworkRequest::basicAuthentication()
@@ -806,10 +651,7 @@ void tst_NetworkRequest::basicAuthentication()
     NetworkRequest *r = request();
     r->setUser(QStringLiteral("ann"));
     r->setPassword(QStringLiteral("secret"));
-    r->setUrl(QUrl(m_server->urlFor("/auth?user=ann&password=secret&realm=right")));
-    r->send();
-    QVERIFY(waitComplete(r));
-    QCOMPARE(r->status(), 200);
+    sendAndWait(r, "/auth?user=ann&password=secret&realm=right");
     QCOMPARE(r->responseText(), QStringLiteral("welcome"));
 
     // Wrong credentials fail once, without asking for ever. Another server,
@@ -824,7 +666,6 @@ void tst_NetworkRequest::basicAuthentication()
     wrong->send();
     QVERIFY(waitComplete(wrong));
     QCOMPARE(wrong->errorCode(), int(QNetworkReply::AuthenticationRequiredError));
-    QCOMPARE(wrong->status(), 401);
     QCOMPARE(errorSpy.count(), 1);
     QVERIFY(other->requestCount() <= 3);
 }
@@ -855,10 +696,7 @@ void tst_NetworkRequest::tlsErrors()
     QVERIFY(!first.value("errorString").toString().isEmpty());
     const QVariantMap cert = first.value("certificate").toMap();
     QVERIFY(cert.value("isSelfSigned").toBool());
-    QVERIFY(!cert.value("isNull").toBool());
-    QCOMPARE(cert.value("subject").toMap().value("CN").toList(), QVariantList { QStringLiteral("127.0.0.1") });
     QCOMPARE(cert.value("issuer").toMap().value("O").toList(), QVariantList { QStringLiteral("Loomkit Tests") });
-    QVERIFY(!cert.value("subject").toMap().contains("EM"));
     QVERIFY(cert.value("expiryDate").toDateTime() > QDateTime::currentDateTime());
 
     r->setIgnoreSslErrors(true);
@@ -871,22 +709,21 @@ void tst_NetworkRequest::tlsErrors()
     QVERIFY(r->attribute(NetworkRequest::ConnectionEncryptedAttribute, true).toBool());
 }
 
-void tst_NetworkRequest::networkLossCompletesEveryLiveRequest()
+void tst_NetworkRequest::outsideEventsEndLiveRequests()
 {
     NetworkRequest *done = request();
     NetworkRequest *first = request();
     NetworkRequest *second = request();
-    done->setUrl(QUrl(m_server->urlFor("/bytes?size=10")));
     first->setUrl(QUrl(m_server->urlFor("/hang")));
     second->setUrl(QUrl(m_server->urlFor("/hang")));
     first->send();
     second->send();
-    done->send();
-    QVERIFY(waitComplete(done));
+    sendAndWait(done, "/bytes?size=10");
     // A finish for one leaves the others alone.
     QCOMPARE(first->readyState(), NetworkRequest::ReadyStateSending);
     QCOMPARE(second->readyState(), NetworkRequest::ReadyStateSending);
 
+    // Losing the network completes every live request, and only those.
     QSignalSpy doneSpy(done, &NetworkRequest::errorCodeChanged);
     emit m_engine->networkAccessManager()->networkAccessibleChanged(QNetworkAccessManager::NotAccessible);
     for (NetworkRequest *r : { first, second }) {
@@ -895,18 +732,13 @@ void tst_NetworkRequest::networkLossCompletesEveryLiveRequest()
         QCOMPARE(r->errorText(), QStringLiteral("NETWORK CLOSED"));
     }
     QCOMPARE(doneSpy.count(), 0);
-    QCOMPARE(done->errorCode(), 0);
-}
 
-void tst_NetworkRequest::accessCacheClearingAborts()
-{
-    NetworkRequest *r = request();
-    r->setUrl(QUrl(m_server->urlFor("/hang")));
-    r->send();
+    // Clearing the access cache aborts.
+    first->send();
     QTest::qWait(20);
     m_service->emitAccessCacheClearing();
-    QVERIFY(waitComplete(r));
-    QCOMPARE(r->errorCode(), int(QNetworkReply::OperationCanceledError));
+    QVERIFY(waitComplete(first));
+    QCOMPARE(first->errorCode(), int(QNetworkReply::OperationCanceledError));
 }
 
 void tst_NetworkRequest::abortAndRetry()
@@ -921,10 +753,9 @@ void tst_NetworkRequest::abortAndRetry()
     r->send(QStringLiteral("payload"));
     QTest::qWait(20);
     r->abort();
+    r->abort();
     QCOMPARE(r->readyState(), NetworkRequest::ReadyStateComplete);
     QCOMPARE(r->errorCode(), int(QNetworkReply::OperationCanceledError));
-    QCOMPARE(errorSpy.count(), 1);
-    r->abort();
     QCOMPARE(errorSpy.count(), 1);
 
     // The retry goes with what the first try had.
@@ -935,9 +766,7 @@ void tst_NetworkRequest::abortAndRetry()
     QVERIFY(waitComplete(r));
     QCOMPARE(r->responseText(), QStringLiteral("second time"));
     const TestHttpRequest last = m_server->requests().last();
-    QCOMPARE(last.method, QByteArray("POST"));
-    QCOMPARE(last.body, QByteArray("payload"));
-    QCOMPARE(last.header("X-Try"), QByteArray("1"));
+    QCOMPARE(last.method + ' ' + last.body + ' ' + last.header("X-Try"), QByteArray("POST payload 1"));
 }
 
 void tst_NetworkRequest::attributes()
@@ -946,6 +775,7 @@ void tst_NetworkRequest::attributes()
     r->setAttribute(NetworkRequest::CacheLoadControlAttribute, int(QNetworkRequest::AlwaysNetwork));
     r->setAttribute(NetworkRequest::HttpPipeliningAllowedAttribute, true);
     r->setAttribute(NetworkRequest::HttpPipeliningAllowedAttribute, QVariant());
+    // Set attributes show on the live request only.
     QVERIFY(!r->attribute(NetworkRequest::CacheLoadControlAttribute).isValid());
     r->setUrl(QUrl(m_server->urlFor("/hang")));
     r->send();
@@ -955,27 +785,10 @@ void tst_NetworkRequest::attributes()
     r->abort();
     QVERIFY(!r->attribute(NetworkRequest::CacheLoadControlAttribute).isValid());
 
-    r->setUrl(QUrl(m_server->urlFor("/status?code=201")));
-    r->send();
-    QVERIFY(waitComplete(r));
+    sendAndWait(r, "/status?code=201");
     QCOMPARE(r->attribute(NetworkRequest::HttpStatusCodeAttribute, true).toInt(), 201);
     QCOMPARE(r->attribute(NetworkRequest::HttpReasonPhraseAttribute, true).toString(), QStringLiteral("Created"));
     QVERIFY(!r->attribute(NetworkRequest::User, true).isValid());
-}
-
-void tst_NetworkRequest::headerInjectionRefused()
-{
-    NetworkRequest *r = request();
-    r->headers()->setValue(QStringLiteral("X-Evil"), QStringLiteral("a\r\nX-Injected: 1"));
-    r->headers()->setValue(QStringLiteral("X-Good"), QStringLiteral("fine"));
-    r->setUrl(QUrl(m_server->urlFor("/echo")));
-    QTest::ignoreMessage(QtWarningMsg, QRegularExpression("Skipping header"));
-    r->send();
-    QVERIFY(waitComplete(r));
-    const QVariantMap headers = echoOf(r).value("headers").toMap();
-    QVERIFY(!headers.contains("x-injected"));
-    QVERIFY(!headers.contains("x-evil"));
-    QCOMPARE(headers.value("x-good").toString(), QStringLiteral("fine"));
 }
 
 QTEST_MAIN(tst_NetworkRequest)
