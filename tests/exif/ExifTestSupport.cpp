@@ -1,5 +1,4 @@
 #include "ExifTestSupport.h"
-#include "TestSupport.h"
 
 #include <QDir>
 #include <QFile>
@@ -8,6 +7,46 @@
 #include <QJsonDocument>
 
 namespace ExifTestSupport {
+
+QString describe(const QExifValue &value)
+{
+    QStringList items;
+    const auto numbers = [&items](const auto &vector) {
+        for (auto v : vector)
+            items.append(QString::number(v));
+    };
+    const auto pairs = [&items](const auto &vector) {
+        for (const auto &v : vector)
+            items.append(QStringLiteral("%1/%2").arg(v.first).arg(v.second));
+    };
+    switch (value.type()) {
+    case QExifValue::Byte:
+        numbers(value.toByteVector());
+        break;
+    case QExifValue::Ascii:
+        items.append(value.toString());
+        break;
+    case QExifValue::Short:
+        numbers(value.toShortVector());
+        break;
+    case QExifValue::Long:
+        numbers(value.toLongVector());
+        break;
+    case QExifValue::Rational:
+        pairs(value.toRationalVector());
+        break;
+    case QExifValue::Undefined:
+        items.append(QString::fromLatin1(value.toByteArray().toPercentEncoding()));
+        break;
+    case QExifValue::SignedLong:
+        numbers(value.toSignedLongVector());
+        break;
+    case QExifValue::SignedRational:
+        pairs(value.toSignedRationalVector());
+        break;
+    }
+    return QString::number(value.type()) + QLatin1Char(':') + items.join(QLatin1Char(','));
+}
 
 bool makeJpeg(const QString &path, int width, int height, const QColor &color)
 {

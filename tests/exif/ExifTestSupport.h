@@ -1,12 +1,20 @@
 #ifndef EXIFTESTSUPPORT_H
 #define EXIFTESTSUPPORT_H
 
+#include "QExifValue.h"
+#include "TestSupport.h"
+
 #include <QByteArray>
 #include <QColor>
 #include <QJsonObject>
 #include <QList>
 #include <QString>
 #include <QStringList>
+
+// Oracle tests need exiftool; scripts/setup-debian.sh installs it.
+#define SKIP_WITHOUT_EXIFTOOL()                                                                                          \
+    if (!TestSupport::hasProgram(QStringLiteral("exiftool")))                                                            \
+    QSKIP("exiftool is not installed")
 
 // Helpers shared by the Exif and JPEG tests: sample JPEGs made with QImage,
 // exiftool as the oracle, and a plain marker splitter to look at results.
@@ -17,6 +25,16 @@ struct Segment
     quint16 marker;
     QByteArray data; // without marker and length
 };
+
+template<typename Pair>
+double ratio(const Pair &r)
+{
+    return double(r.first) / r.second;
+}
+
+// A value as "type:item,item", e.g. "3:8,0,0", "5:1/2" or "7:01%00" for
+// UNDEFINED bytes (percent-encoded), to compare values and show them.
+QString describe(const QExifValue &value);
 
 // A small baseline JPEG of the given size and colour, written by QImage.
 bool makeJpeg(const QString &path, int width = 64, int height = 48, const QColor &color = Qt::darkCyan);
@@ -35,6 +53,17 @@ QByteArray assemble(const QList<Segment> &segments, const QByteArray &scanAndRes
 
 QByteArray readFile(const QString &path);
 bool writeFile(const QString &path, const QByteArray &data);
+
+// Rewrites the file with its segments passed through edit; false on failure.
+template<typename Edit>
+bool editSegments(const QString &path, Edit edit)
+{
+    int sos = -1;
+    const QByteArray jpeg = readFile(path);
+    QList<Segment> list = segments(jpeg, &sos);
+    edit(list);
+    return sos > 0 && writeFile(path, assemble(list, jpeg.mid(sos)));
+}
 
 } // namespace ExifTestSupport
 

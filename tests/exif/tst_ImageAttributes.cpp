@@ -1,6 +1,5 @@
 #include "ExifTestSupport.h"
 #include "ImageAttributes.h"
-#include "TestSupport.h"
 
 #include <QDir>
 #include <QFile>
@@ -46,37 +45,38 @@ private slots:
     void roundTrip();
     void chunking_data();
     void chunking();
-    void binaryValuesAreReferences();
-    void longKeysAreCut();
+    void keysAndValues();
     void removal();
     void placement();
     void foreignSegmentsSurvive();
-    void separateTarget();
-    void notAJpeg();
+    void targets();
     void filesInAndOut();
-    void chunksOutOfOrder();
-    void keysAndWildcards();
     void stillAJpegForOtherTools();
     void properties();
 
 private:
+    ImageAttributes *attributes() { return m_attributes.data(); }
+
     QTemporaryDir m_dir;
     QString m_original;
     QString m_path;
+    QScopedPointer<ImageAttributes> m_attributes;
 };
 
 void tst_ImageAttributes::initTestCase()
 {
     QVERIFY(m_dir.isValid());
-    m_original = m_dir.filePath(QStringLiteral("original.jpg"));
+    m_original = m_dir.filePath("original.jpg");
     QVERIFY(makeJpeg(m_original));
 }
 
 void tst_ImageAttributes::init()
 {
-    m_path = m_dir.filePath(QStringLiteral("work.jpg"));
+    m_path = m_dir.filePath("work.jpg");
     QFile::remove(m_path);
     QVERIFY(QFile::copy(m_original, m_path));
+    m_attributes.reset(new ImageAttributes);
+    m_attributes->setFilePath(m_path);
 }
 
 void tst_ImageAttributes::roundTrip_data()
@@ -85,12 +85,8 @@ void tst_ImageAttributes::roundTrip_data()
     QTest::addColumn<int>("valueType");
     QTest::addColumn<QVariant>("expected");
 
-    QVariantMap map;
-    map.insert(QStringLiteral("name"), QStringLiteral("Loom"));
-    map.insert(QStringLiteral("list"), QVariantList{1, 2.5, QStringLiteral("x")});
-    map.insert(QStringLiteral("nested"), QVariantMap{{QStringLiteral("a"), true}});
-
-    QTest::newRow("text") << QVariant(QStringLiteral("Grüße, 世界")) << 10 << QVariant(QStringLiteral("Grüße, 世界"));
+    const QVariantMap map{{"name", "Loom"}, {"list", QVariantList{1, 2.5, "x"}}, {"nested", QVariantMap{{"a", true}}}};
+    QTest::newRow("text") << QVariant("Grüße, 世界") << 10 << QVariant("Grüße, 世界");
     QTest::newRow("empty text") << QVariant(QString(QLatin1String(""))) << 10 << QVariant(QString(QLatin1String("")));
     QTest::newRow("bytes") << QVariant(QByteArray("\0\1\2\xff", 4)) << 12 << QVariant(QByteArray("\0\1\2\xff", 4));
     QTest::newRow("map") << QVariant(map) << 8 << QVariant(map);
@@ -107,30 +103,23 @@ void tst_ImageAttributes::roundTrip()
     QFETCH(int, valueType);
     QFETCH(QVariant, expected);
 
-    ImageAttributes attributes;
-    attributes.setFilePath(m_path);
-    QVERIFY(attributes.setValue(QStringLiteral("key"), value));
+    QVERIFY(attributes()->setValue("key", value));
     QVERIFY(!QFile::exists(m_path + QLatin1String(".tmp")));
-
-    const QList<ImageAttributes::Segment> list = attributeSegments(attributes, m_path);
+    const QList<ImageAttributes::Segment> list = attributeSegments(*attributes(), m_path);
     QCOMPARE(list.size(), 1);
     QCOMPARE(int(list.first().valueType), valueType);
     QCOMPARE(list.first().version, quint16(0x0502));
     QCOMPARE(list.first().key, QStringLiteral("key"));
 
-    const QVariant back = attributes.value(QStringLiteral("key"));
+    const QVariant back = attributes()->value("key");
     QCOMPARE(back.userType(), expected.userType());
     if (expected.userType() == QMetaType::QObjectStar)
         QCOMPARE(back.value<QObject *>(), nullptr);
-    else
-        QCOMPARE(back, expected);
-    if (valueType != 12)
-        QCOMPARE(attributes.values().value(QStringLiteral("key")), back);
-
+    else QCOMPARE(back, expected);
     // Writing it again replaces it.
-    QVERIFY(attributes.setValue(QStringLiteral("key"), QStringLiteral("second")));
-    QCOMPARE(attributeSegments(attributes, m_path).size(), 1);
-    QCOMPARE(attributes.value(QStringLiteral("key")), QVariant(QStringLiteral("second")));
+    QVERIFY(attributes()->setValue("key", "second"));
+    QCOMPARE(attributeSegments(*attributes(), m_path).size(), 1);
+    QCOMPARE(attributes()->value("key"), QVariant("second"));
 }
 
 void tst_ImageAttributes::chunking_data()
@@ -151,12 +140,9 @@ void tst_ImageAttributes::chunking()
     QByteArray data(size, Qt::Uninitialized);
     for (int i = 0; i < size; ++i)
         data[i] = char(i * 7 + i / 251);
+    QVERIFY(attributes()->setValue("blob", data));
 
-    ImageAttributes attributes;
-    attributes.setFilePath(m_path);
-    QVERIFY(attributes.setValue(QStringLiteral("blob"), data));
-
-    const QList<ImageAttributes::Segment> list = attributeSegments(attributes, m_path);
+    const QList<ImageAttributes::Segment> list = attributeSegments(*attributes(), m_path);
     QCOMPARE(list.size(), chunkSizes.size());
     quint32 offset = 0;
     for (int i = 0; i < list.size(); ++i) {
@@ -165,194 +151,162 @@ void tst_ImageAttributes::chunking()
         QCOMPARE(list[i].totalSize, quint32(size));
         offset += chunkSizes[i];
     }
-    // The longest segment still fits the 16-bit length field.
-    for (const Segment &segment : segments(readFile(m_path)))
-        QVERIFY(segment.data.size() + 2 <= 65535);
-    QCOMPARE(attributes.value(QStringLiteral("blob")).toByteArray(), data);
+    QCOMPARE(attributes()->value("blob").toByteArray(), data);
     QVERIFY(!QImage(m_path).isNull());
+    if (size < 70000)
+        return;
+
+    // Without its first chunk a value never completes; keys() goes by first chunks.
+    QVERIFY(attributes()->setValue("small", "s"));
+    QVERIFY(editSegments(m_path, [this](QList<Segment> &segments) {
+        for (int i = 0; i < segments.size(); ++i) {
+            ImageAttributes::Segment parsed;
+            if (attributes()->parse(segments[i].data, &parsed, false) && parsed.key == QLatin1String("blob")
+                && parsed.chunkOffset == 0)
+                segments.removeAt(i--);
+        }
+    }));
+    QVERIFY(!attributes()->value("blob").isValid());
+    QCOMPARE(attributes()->keys().toStringList(), QStringList{"small"});
 }
 
-void tst_ImageAttributes::binaryValuesAreReferences()
+void tst_ImageAttributes::keysAndValues()
 {
-    ImageAttributes attributes;
-    attributes.setFilePath(m_path);
-    QVERIFY(attributes.setValues({{QStringLiteral("a"), QByteArray("raw")}, {QStringLiteral("b"), QStringLiteral("text")}}));
+    QVERIFY(ImageAttributes::keyMatches("photo.1", {"photo.*"}, true));
+    QVERIFY(!ImageAttributes::keyMatches("photo.1", {"photo.*"}, false));
+    QVERIFY(!ImageAttributes::keyMatches("Photo.1", {"photo.*"}, true));
+    QVERIFY(ImageAttributes::keyMatches("a1", {"x", "a?"}, true));
+    QVERIFY(!ImageAttributes::keyMatches("a12", {"a?"}, true));
 
-    const QVariantMap all = attributes.values();
-    QCOMPARE(all.size(), 2);
-    QCOMPARE(all.value(QStringLiteral("a")), QVariant(QUrl(QStringLiteral("blob://imageattributes/a"))));
-    QCOMPARE(all.value(QStringLiteral("b")), QVariant(QStringLiteral("text")));
-    QCOMPARE(attributes.value(QStringLiteral("a")), QVariant(QByteArray("raw")));
-    QCOMPARE(attributes.values(QStringLiteral("b")).keys(), QStringList{QStringLiteral("b")});
-    QVERIFY(!attributes.value(QStringLiteral("missing")).isValid());
-}
+    QVERIFY(attributes()->setValues({{"photo.1", "1"}, {"photo.2", QByteArray("raw")}, {"other", "3"}}));
+    QCOMPARE(attributes()->values("photo.*").keys(), (QStringList{"photo.1", "photo.2"}));
+    // Binary values are listed as references and read whole by value().
+    const QVariantMap some = attributes()->values(QStringList{"oth*", "photo.2"});
+    QCOMPARE(some.keys(), (QStringList{"other", "photo.2"}));
+    QCOMPARE(some.value("photo.2"), QVariant(QUrl(QStringLiteral("blob://imageattributes/photo.2"))));
+    QCOMPARE(attributes()->value("photo.2"), QVariant(QByteArray("raw")));
+    // value() takes the key literally.
+    QVERIFY(!attributes()->value("photo.*").isValid());
 
-void tst_ImageAttributes::longKeysAreCut()
-{
-    ImageAttributes attributes;
-    attributes.setFilePath(m_path);
+    // Keys are cut to 1024 bytes; one of exactly 1024 has no terminator and
+    // still reads whole. New values go ahead of the ones already there.
     const QString longKey(1030, QLatin1Char('k'));
     const QString exactKey(1024, QLatin1Char('e'));
-    QVERIFY(attributes.setValue(longKey, QStringLiteral("long")));
-    QVERIFY(attributes.setValue(exactKey, QStringLiteral("exact")));
-
-    QVERIFY(!attributes.value(longKey).isValid());
-    QCOMPARE(attributes.value(longKey.left(1024)), QVariant(QStringLiteral("long")));
-    // A key of exactly 1024 bytes has no terminator and still reads whole.
-    QCOMPARE(attributes.value(exactKey), QVariant(QStringLiteral("exact")));
-    // New values go ahead of the ones already there.
-    QCOMPARE(attributes.keys().toStringList(), (QStringList{exactKey, longKey.left(1024)}));
+    attributes()->removeAll();
+    QVERIFY(attributes()->setValue(longKey, "long"));
+    QVERIFY(attributes()->setValue(exactKey, "exact"));
+    QVERIFY(!attributes()->value(longKey).isValid());
+    QCOMPARE(attributes()->value(longKey.left(1024)), QVariant("long"));
+    QCOMPARE(attributes()->value(exactKey), QVariant("exact"));
+    QCOMPARE(attributes()->keys().toStringList(), (QStringList{exactKey, longKey.left(1024)}));
 }
 
 void tst_ImageAttributes::removal()
 {
-    ImageAttributes attributes;
-    attributes.setFilePath(m_path);
-    QVERIFY(attributes.setValues({{QStringLiteral("a"), QStringLiteral("1")},
-                                  {QStringLiteral("b"), QStringLiteral("2")},
-                                  {QStringLiteral("c"), QStringLiteral("3")}}));
+    QVERIFY(attributes()->setValues({{"a", "1"}, {"b", "2"}, {"c", "3"}}));
     const QByteArray before = readFile(m_path);
-
     // Removing what isn't there leaves the file as it was, and no temporary.
-    attributes.remove(QStringLiteral("zzz"));
+    attributes()->remove("zzz");
     QCOMPARE(readFile(m_path), before);
     QVERIFY(!QFile::exists(m_path + QLatin1String(".tmp")));
-
-    attributes.remove(QStringLiteral("b"));
-    QCOMPARE(attributes.keys().toStringList(), (QStringList{QStringLiteral("a"), QStringLiteral("c")}));
-    attributes.remove(QStringList{QStringLiteral("a"), QStringLiteral("c")});
-    QVERIFY(attributes.keys().toStringList().isEmpty());
-
-    QVERIFY(attributes.setValues({{QStringLiteral("x"), 1}, {QStringLiteral("y"), 2}}));
+    attributes()->remove("b");
+    QCOMPARE(attributes()->keys().toStringList(), (QStringList{"a", "c"}));
     // A key of "*" removes nothing unless it is a pattern.
-    attributes.remove(QStringLiteral("*"));
-    QCOMPARE(attributes.keys().toStringList().size(), 2);
-    attributes.removeAll();
-    QVERIFY(attributes.keys().toStringList().isEmpty());
+    attributes()->remove("*");
+    QCOMPARE(attributes()->keys().toStringList().size(), 2);
+    attributes()->remove(QStringList{"a", "c"});
     QCOMPARE(readFile(m_path), readFile(m_original));
-
     // setValue with an invalid value removes too.
-    QVERIFY(attributes.setValue(QStringLiteral("a"), QStringLiteral("1")));
-    QVERIFY(attributes.setValue(QStringLiteral("a"), QVariant()));
+    QVERIFY(attributes()->setValue("a", "1"));
+    QVERIFY(attributes()->setValue("a", QVariant()));
     QCOMPARE(readFile(m_path), readFile(m_original));
 }
 
 void tst_ImageAttributes::placement()
 {
     // SOI, APP0, APP9, APP11, then the rest: the new segment goes before APP11.
-    int sos = -1;
-    const QByteArray jpeg = readFile(m_original);
-    QList<Segment> list = segments(jpeg, &sos);
-    QCOMPARE(list.first().marker, quint16(0xffe0));
-    list.insert(1, Segment{0xffe9, QByteArray("nine")});
-    list.insert(2, Segment{0xffeb, QByteArray("eleven")});
-    list.insert(3, Segment{0xffe1, QByteArray("late APP1")});
-    QVERIFY(writeFile(m_path, assemble(list, jpeg.mid(sos))));
-
-    ImageAttributes attributes;
-    attributes.setFilePath(m_path);
-    QVERIFY(attributes.setValue(QStringLiteral("k"), QStringLiteral("v")));
-    const QList<quint16> order = markers(m_path);
-    QCOMPARE(order.mid(0, 5), (QList<quint16>{0xffe0, 0xffe9, 0xffea, 0xffeb, 0xffe1}));
-    QCOMPARE(readFile(m_path).mid(readFile(m_path).size() - (jpeg.size() - sos)), jpeg.mid(sos));
+    QVERIFY(editSegments(m_path, [](QList<Segment> &list) {
+        list.insert(1, Segment{0xffe9, QByteArray("nine")});
+        list.insert(2, Segment{0xffeb, QByteArray("eleven")});
+        list.insert(3, Segment{0xffe1, QByteArray("late APP1")});
+    }));
+    const QByteArray scan = readFile(m_path).mid(readFile(m_path).indexOf("\xff\xda"));
+    QVERIFY(attributes()->setValue("k", "v"));
+    QCOMPARE(markers(m_path).mid(0, 5), (QList<quint16>{0xffe0, 0xffe9, 0xffea, 0xffeb, 0xffe1}));
+    QVERIFY(readFile(m_path).endsWith(scan));
 
     // An old value elsewhere is dropped wherever it was.
     ImageAttributes other;
     other.setFilePath(m_path);
     other.setAppMarker(0xffe2);
-    QVERIFY(other.setValue(QStringLiteral("k"), QStringLiteral("APP2 value")));
+    QVERIFY(other.setValue("k", "APP2 value"));
     QCOMPARE(markers(m_path).mid(0, 6), (QList<quint16>{0xffe0, 0xffe2, 0xffe9, 0xffea, 0xffeb, 0xffe1}));
-    QCOMPARE(attributes.value(QStringLiteral("k")), QVariant(QStringLiteral("v")));
-    QCOMPARE(other.value(QStringLiteral("k")), QVariant(QStringLiteral("APP2 value")));
+    QCOMPARE(attributes()->value("k"), QVariant("v"));
 }
 
 void tst_ImageAttributes::foreignSegmentsSurvive()
 {
-    int sos = -1;
-    const QByteArray jpeg = readFile(m_original);
-    QList<Segment> list = segments(jpeg, &sos);
     // Same marker, other signature; and one of ours whose sizes don't agree.
-    list.insert(1, Segment{0xffea, QByteArray("OTHER\0\0\0payload", 15)});
-    ImageAttributes attributes;
     QByteArray broken = QByteArray("ZETH\0\0\0\0", 8) + QByteArray(1040, '\0');
     broken[15] = 100; // totalSize 100 but no data
     broken[23] = 100; // chunkSize 100
-    list.insert(2, Segment{0xffea, broken});
-    QVERIFY(writeFile(m_path, assemble(list, jpeg.mid(sos))));
-
-    attributes.setFilePath(m_path);
-    QVERIFY(attributes.values().isEmpty());
-    QVERIFY(attributes.setValue(QStringLiteral("k"), QStringLiteral("v")));
-    attributes.removeAll();
-    const QList<Segment> after = segments(readFile(m_path));
-    int foreign = 0;
-    for (const Segment &segment : after)
-        foreign += segment.marker == 0xffea ? 1 : 0;
-    QCOMPARE(foreign, 2);
+    QVERIFY(editSegments(m_path, [&broken](QList<Segment> &list) {
+        list.insert(1, Segment{0xffea, QByteArray("OTHER\0\0\0payload", 15)});
+        list.insert(2, Segment{0xffea, broken});
+    }));
+    QVERIFY(attributes()->values().isEmpty());
+    QVERIFY(attributes()->setValue("k", "v"));
+    attributes()->removeAll();
+    QCOMPARE(markers(m_path).count(0xffea), 2);
 
     // Another signature makes another namespace.
     ImageAttributes mine;
     mine.setFilePath(m_path);
-    mine.setSignature(QStringLiteral("MINEMINEMINE"));
-    QVERIFY(mine.setValue(QStringLiteral("k"), QStringLiteral("mine")));
-    QVERIFY(attributes.setValue(QStringLiteral("k"), QStringLiteral("ours")));
-    QCOMPARE(mine.value(QStringLiteral("k")), QVariant(QStringLiteral("mine")));
-    QCOMPARE(attributes.value(QStringLiteral("k")), QVariant(QStringLiteral("ours")));
+    mine.setSignature("MINEMINEMINE");
+    QVERIFY(mine.setValue("k", "mine"));
+    QVERIFY(attributes()->setValue("k", "ours"));
+    QCOMPARE(mine.value("k"), QVariant("mine"));
+    QCOMPARE(attributes()->value("k"), QVariant("ours"));
 }
 
-void tst_ImageAttributes::separateTarget()
+void tst_ImageAttributes::targets()
 {
-    const QString target = m_dir.filePath(QStringLiteral("target.jpg"));
-    QFile::remove(target);
-    ImageAttributes attributes;
-    attributes.setFilePath(m_path);
-    attributes.setDestFilePath(target);
-
     // Nothing matched, nothing written: still a full copy.
-    attributes.remove(QStringLiteral("none"));
+    const QString target = m_dir.filePath("target.jpg");
+    QFile::remove(target);
+    attributes()->setDestFilePath(target);
+    attributes()->remove("none");
     QCOMPARE(readFile(target), readFile(m_path));
-
-    QVERIFY(attributes.setValue(QStringLiteral("k"), QStringLiteral("v")));
+    QVERIFY(attributes()->setValue("k", "v"));
     QCOMPARE(readFile(m_path), readFile(m_original));
     ImageAttributes reader;
     reader.setFilePath(target);
-    QCOMPARE(reader.value(QStringLiteral("k")), QVariant(QStringLiteral("v")));
-    QVERIFY(!QImage(target).isNull());
-
+    QCOMPARE(reader.value("k"), QVariant("v"));
     // The same path as the source counts as in place.
-    attributes.setDestFilePath(m_path);
-    QVERIFY(attributes.setValue(QStringLiteral("k"), QStringLiteral("here")));
-    QCOMPARE(reader.value(QStringLiteral("k")), QVariant(QStringLiteral("v")));
-    attributes.setDestFilePath(QString());
-    QCOMPARE(attributes.value(QStringLiteral("k")), QVariant(QStringLiteral("here")));
-}
+    attributes()->setDestFilePath(m_path);
+    QVERIFY(attributes()->setValue("k", "here"));
+    QCOMPARE(reader.value("k"), QVariant("v"));
+    attributes()->setDestFilePath(QString());
+    QCOMPARE(attributes()->value("k"), QVariant("here"));
 
-void tst_ImageAttributes::notAJpeg()
-{
-    const QString text = m_dir.filePath(QStringLiteral("text.jpg"));
+    // Not a JPEG: written in place, nothing changes.
+    const QString text = m_dir.filePath("text.jpg");
     const QByteArray notJpeg("AB\0\x05xyzREST-OF-FILE", 19);
     QVERIFY(writeFile(text, notJpeg));
-    ImageAttributes attributes;
-    attributes.setFilePath(text);
-    QVERIFY(attributes.setValue(QStringLiteral("k"), QStringLiteral("v")));
+    attributes()->setFilePath(text);
+    QVERIFY(attributes()->setValue("k", "v"));
     QCOMPARE(readFile(text), notJpeg);
     QVERIFY(!QFile::exists(text + QLatin1String(".tmp")));
-    QVERIFY(attributes.values().isEmpty());
-    QVERIFY(attributes.keys().toStringList().isEmpty());
-
+    QVERIFY(attributes()->values().isEmpty());
     // A separate target gets what follows the point where reading stopped:
     // the first "marker", its length and its data were consumed.
-    const QString target = m_dir.filePath(QStringLiteral("text-target.jpg"));
-    attributes.setDestFilePath(target);
-    QVERIFY(attributes.setValue(QStringLiteral("k"), QStringLiteral("v")));
+    attributes()->setDestFilePath(target);
+    QVERIFY(attributes()->setValue("k", "v"));
     QCOMPARE(readFile(target), QByteArray("REST-OF-FILE"));
-    QCOMPARE(readFile(text), notJpeg);
-
     // Missing files.
-    attributes.setFilePath(m_dir.filePath(QStringLiteral("missing.jpg")));
-    QVERIFY(!attributes.setValue(QStringLiteral("k"), QStringLiteral("v")));
-    QVERIFY(!attributes.keys().isValid());
-    QVERIFY(attributes.values().isEmpty());
+    attributes()->setFilePath(m_dir.filePath("missing.jpg"));
+    QVERIFY(!attributes()->setValue("k", "v"));
+    QVERIFY(!attributes()->keys().isValid());
 }
 
 void tst_ImageAttributes::filesInAndOut()
@@ -360,168 +314,71 @@ void tst_ImageAttributes::filesInAndOut()
     QByteArray content(200000, Qt::Uninitialized);
     for (int i = 0; i < content.size(); ++i)
         content[i] = char(i % 253);
-    const QString source = m_dir.filePath(QStringLiteral("content.bin"));
+    const QString source = m_dir.filePath("content.bin");
+    const QString out = m_dir.filePath("out.bin");
     QVERIFY(writeFile(source, content));
-
-    ImageAttributes attributes;
-    attributes.setFilePath(m_path);
-    QVERIFY(attributes.loadValueFromFile(QStringLiteral("file"), source));
-    QCOMPARE(attributeSegments(attributes, m_path).size(), 4);
-    QVERIFY(attributes.loadValueFromFile(QStringLiteral("url"), QUrl::fromLocalFile(source)));
-
-    const QString out = m_dir.filePath(QStringLiteral("out.bin"));
-    QVERIFY(attributes.saveValueToFile(QStringLiteral("file"), out));
+    QVERIFY(attributes()->loadValueFromFile("file", QUrl::fromLocalFile(source)));
+    QCOMPARE(attributeSegments(*attributes(), m_path).size(), 4);
+    QVERIFY(attributes()->saveValueToFile("file", QUrl::fromLocalFile(out)));
     QCOMPARE(readFile(out), content);
-    QVERIFY(attributes.saveValueToFile(QStringLiteral("url"), QUrl::fromLocalFile(out)));
-    QCOMPARE(readFile(out), content);
-
-    QVERIFY(attributes.setValue(QStringLiteral("text"), QStringLiteral("ünï")));
-    QVERIFY(attributes.saveValueToFile(QStringLiteral("text"), out));
+    QVERIFY(attributes()->setValue("text", "ünï"));
+    QVERIFY(attributes()->saveValueToFile("text", out));
     QCOMPARE(readFile(out), QStringLiteral("ünï").toUtf8());
 
     // Nothing to save, or nowhere to save it.
-    QVERIFY(attributes.setValue(QStringLiteral("empty"), QString(QLatin1String(""))));
-    QVERIFY(!attributes.saveValueToFile(QStringLiteral("empty"), out));
-    QVERIFY(!attributes.saveValueToFile(QStringLiteral("missing"), out));
-    QVERIFY(!attributes.saveValueToFile(QString(), out));
-    QVERIFY(!attributes.saveValueToFile(QStringLiteral("text"), QString()));
-    QVERIFY(!attributes.saveValueToFile(QStringLiteral("text"), QUrl()));
-    QVERIFY(!attributes.saveValueToFile(QStringLiteral("text"), m_dir.filePath(QStringLiteral("no/such/dir/x"))));
-
+    QVERIFY(attributes()->setValue("empty", QString(QLatin1String(""))));
+    QVERIFY(!attributes()->saveValueToFile("empty", out));
+    QVERIFY(!attributes()->saveValueToFile("missing", out));
+    QVERIFY(!attributes()->saveValueToFile("text", QUrl()));
+    QVERIFY(!attributes()->saveValueToFile("text", m_dir.filePath("no/such/dir/x")));
     // A file that can't be read changes nothing and says so.
     const QByteArray before = readFile(m_path);
     QTest::ignoreMessage(QtWarningMsg, QRegularExpression(QStringLiteral("Unable to read")));
-    QVERIFY(!attributes.loadValueFromFile(QStringLiteral("nope"), m_dir.filePath(QStringLiteral("absent.bin"))));
+    QVERIFY(!attributes()->loadValueFromFile("nope", m_dir.filePath("absent.bin")));
     QCOMPARE(readFile(m_path), before);
-    QVERIFY(!QFile::exists(m_path + QLatin1String(".tmp")));
-}
-
-void tst_ImageAttributes::chunksOutOfOrder()
-{
-    ImageAttributes attributes;
-    attributes.setFilePath(m_path);
-    QVERIFY(attributes.setValues({{QStringLiteral("big"), QByteArray(70000, 'b')}, {QStringLiteral("small"), QStringLiteral("s")}}));
-
-    // Drop the first chunk of "big": what is left never completes.
-    int sos = -1;
-    const QByteArray jpeg = readFile(m_path);
-    QList<Segment> list = segments(jpeg, &sos);
-    for (int i = 0; i < list.size(); ++i) {
-        ImageAttributes::Segment parsed;
-        if (attributes.parse(list[i].data, &parsed, false) && parsed.key == QLatin1String("big") && parsed.chunkOffset == 0) {
-            list.removeAt(i);
-            break;
-        }
-    }
-    QVERIFY(writeFile(m_path, assemble(list, jpeg.mid(sos))));
-    QVERIFY(!attributes.value(QStringLiteral("big")).isValid());
-    QCOMPARE(attributes.value(QStringLiteral("small")), QVariant(QStringLiteral("s")));
-    // keys() lists values by their first chunk only.
-    QCOMPARE(attributes.keys().toStringList(), QStringList{QStringLiteral("small")});
-}
-
-void tst_ImageAttributes::keysAndWildcards()
-{
-    QVERIFY(ImageAttributes::keyMatches(QStringLiteral("photo.1"), {QStringLiteral("photo.*")}, true));
-    QVERIFY(!ImageAttributes::keyMatches(QStringLiteral("photo.1"), {QStringLiteral("photo.*")}, false));
-    QVERIFY(ImageAttributes::keyMatches(QStringLiteral("photo.*"), {QStringLiteral("photo.*")}, false));
-    QVERIFY(!ImageAttributes::keyMatches(QStringLiteral("Photo.1"), {QStringLiteral("photo.*")}, true));
-    QVERIFY(ImageAttributes::keyMatches(QStringLiteral("a1"), {QStringLiteral("x"), QStringLiteral("a?")}, true));
-    QVERIFY(!ImageAttributes::keyMatches(QStringLiteral("a12"), {QStringLiteral("a?")}, true));
-    QVERIFY(ImageAttributes::keyMatches(QStringLiteral("b"), {QStringLiteral("[abc]")}, true));
-
-    ImageAttributes attributes;
-    attributes.setFilePath(m_path);
-    QVERIFY(attributes.setValues({{QStringLiteral("photo.1"), QStringLiteral("1")},
-                                  {QStringLiteral("photo.2"), QStringLiteral("2")},
-                                  {QStringLiteral("other"), QStringLiteral("3")}}));
-    QCOMPARE(attributes.values(QStringLiteral("photo.*")).keys(),
-             (QStringList{QStringLiteral("photo.1"), QStringLiteral("photo.2")}));
-    QCOMPARE(attributes.values(QStringList{QStringLiteral("oth*"), QStringLiteral("photo.2")}).keys(),
-             (QStringList{QStringLiteral("other"), QStringLiteral("photo.2")}));
-    // value() takes the key literally.
-    QVERIFY(!attributes.value(QStringLiteral("photo.*")).isValid());
-    QCOMPARE(attributes.keys().toStringList(),
-             (QStringList{QStringLiteral("other"), QStringLiteral("photo.1"), QStringLiteral("photo.2")}));
 }
 
 void tst_ImageAttributes::stillAJpegForOtherTools()
 {
-    if (!TestSupport::hasProgram(QStringLiteral("exiftool")))
-        QSKIP("exiftool is not installed");
-    QVERIFY(exiftoolWrite(m_path, {QStringLiteral("-Make=Acme"), QStringLiteral("-XMP-dc:Title=Loom")}));
+    SKIP_WITHOUT_EXIFTOOL();
+    QVERIFY(exiftoolWrite(m_path, {"-Make=Acme", "-XMP-dc:Title=Loom"}));
+    QVERIFY(attributes()->setValues({{"big", QByteArray(100000, 'z')}, {"t", "text"}}));
 
-    ImageAttributes attributes;
-    attributes.setFilePath(m_path);
-    QVERIFY(attributes.setValues({{QStringLiteral("big"), QByteArray(100000, 'z')}, {QStringLiteral("t"), QStringLiteral("text")}}));
-
+    QVERIFY(!exiftoolRead(m_path, {"-validate", "-error"}).contains("ExifTool:Error"));
     const QJsonObject tags = exiftoolRead(m_path);
-    QVERIFY(!tags.contains(QStringLiteral("ExifTool:Error")));
-    QCOMPARE(tags.value(QStringLiteral("IFD0:Make")).toString(), QStringLiteral("Acme"));
-    QCOMPARE(tags.value(QStringLiteral("XMP-dc:Title")).toString(), QStringLiteral("Loom"));
-    QCOMPARE(tags.value(QStringLiteral("File:ImageWidth")).toInt(), 64);
-    const QJsonObject validation = exiftoolRead(m_path, {QStringLiteral("-validate"), QStringLiteral("-error")});
-    QVERIFY(!validation.contains(QStringLiteral("ExifTool:Error")));
+    QCOMPARE(tags.value("IFD0:Make").toString(), QStringLiteral("Acme"));
+    QCOMPARE(tags.value("XMP-dc:Title").toString(), QStringLiteral("Loom"));
+    QCOMPARE(tags.value("File:ImageWidth").toInt(), 64);
     QCOMPARE(QImage(m_path).size(), QSize(64, 48));
-
     // exiftool rewrites the file and keeps our segments.
-    QVERIFY(exiftoolWrite(m_path, {QStringLiteral("-Model=Cam")}));
-    QCOMPARE(attributes.value(QStringLiteral("t")), QVariant(QStringLiteral("text")));
-    QCOMPARE(attributes.value(QStringLiteral("big")).toByteArray(), QByteArray(100000, 'z'));
+    QVERIFY(exiftoolWrite(m_path, {"-Model=Cam"}));
+    QCOMPARE(attributes()->value("t"), QVariant("text"));
+    QCOMPARE(attributes()->value("big").toByteArray(), QByteArray(100000, 'z'));
 }
 
 void tst_ImageAttributes::properties()
 {
+    // No file yet: empty results. A leading tilde is the home folder.
     ImageAttributes attributes;
-    // No file yet: empty results.
     QVERIFY(!attributes.keys().isValid());
-    QVERIFY(attributes.values().isEmpty());
-    QVERIFY(!attributes.setValue(QStringLiteral("k"), 1));
-    QCOMPARE(attributes.appMarker(), 65514);
-    QCOMPARE(attributes.signature(), QStringLiteral("ZETH"));
-    QCOMPARE(attributes.version(), ushort(1282));
-
+    QVERIFY(!attributes.setValue("k", 1));
     QSignalSpy path(&attributes, &ImageAttributes::filePathChanged);
-    QSignalSpy url(&attributes, &ImageAttributes::fileUrlChanged);
-    attributes.setFilePath(QStringLiteral("~/pictures/a.jpg"));
+    attributes.setFilePath("~/pictures/a.jpg");
     QCOMPARE(attributes.filePath(), QDir::homePath() + QStringLiteral("/pictures/a.jpg"));
-    QCOMPARE(attributes.fileUrl(), QUrl::fromLocalFile(QDir::homePath() + QStringLiteral("/pictures/a.jpg")));
+    attributes.setFileUrl(QUrl::fromLocalFile(attributes.filePath()));
     QCOMPARE(path.count(), 1);
-    QCOMPARE(url.count(), 1);
-    attributes.setFilePath(QStringLiteral("~/pictures/a.jpg"));
-    attributes.setFileUrl(QUrl::fromLocalFile(QDir::homePath() + QStringLiteral("/pictures/a.jpg")));
-    QCOMPARE(path.count(), 1);
+
+    // Marker and version are written; the version is never compared.
     attributes.setFileUrl(QUrl::fromLocalFile(m_path));
-    QCOMPARE(attributes.filePath(), m_path);
-    QCOMPARE(url.count(), 2);
-
-    QSignalSpy dest(&attributes, &ImageAttributes::destFilePathChanged);
-    QSignalSpy destUrl(&attributes, &ImageAttributes::destFileUrlChanged);
-    attributes.setDestFileUrl(QUrl::fromLocalFile(m_path));
-    QCOMPARE(attributes.destFilePath(), m_path);
-    QCOMPARE(dest.count(), 1);
-    QCOMPARE(destUrl.count(), 1);
-
-    QSignalSpy marker(&attributes, &ImageAttributes::appMarkerChanged);
-    QSignalSpy signature(&attributes, &ImageAttributes::signatureChanged);
-    QSignalSpy version(&attributes, &ImageAttributes::versionChanged);
-    attributes.setAppMarker(65514);
-    attributes.setSignature(QStringLiteral("ZETH"));
-    attributes.setVersion(1282);
-    QCOMPARE(marker.count() + signature.count() + version.count(), 0);
     attributes.setAppMarker(0xffeb);
     attributes.setVersion(7);
-    QCOMPARE(marker.count(), 1);
-    QCOMPARE(version.count(), 1);
-
-    // The version is written, never compared.
-    QVERIFY(attributes.setValue(QStringLiteral("v"), QStringLiteral("seven")));
+    QVERIFY(attributes.setValue("v", "seven"));
     QCOMPARE(attributeSegments(attributes, m_path).first().version, quint16(7));
+    QCOMPARE(markers(m_path).at(1), quint16(0xffeb));
     ImageAttributes reader;
     reader.setFilePath(m_path);
     reader.setAppMarker(0xffeb);
-    QCOMPARE(reader.value(QStringLiteral("v")), QVariant(QStringLiteral("seven")));
-    QCOMPARE(markers(m_path).at(1), quint16(0xffeb));
+    QCOMPARE(reader.value("v"), QVariant("seven"));
 }
 
 QTEST_MAIN(tst_ImageAttributes)

@@ -1,12 +1,9 @@
 #include "ExifTestSupport.h"
 #include "QExifImageHeader.h"
-#include "TestSupport.h"
 
 #include <QBuffer>
-#include <QDir>
 #include <QDirIterator>
 #include <QFile>
-#include <QJsonArray>
 #include <QTemporaryDir>
 #include <QtTest>
 
@@ -14,63 +11,30 @@ using namespace ExifTestSupport;
 
 namespace {
 
-double ratio(const QExifURational &r)
-{
-    return double(r.first) / r.second;
-}
-
-double ratio(const QExifSRational &r)
-{
-    return double(r.first) / r.second;
-}
-
-// Reads numbers out of a TIFF block the way a plain reader would.
+// Reads numbers out of a little-endian TIFF block the way a plain reader would.
 struct Block
 {
     QByteArray data;
-    bool le = true;
 
-    quint16 u16(int offset) const
-    {
-        const uchar *p = reinterpret_cast<const uchar *>(data.constData()) + offset;
-        return le ? quint16(p[0] | p[1] << 8) : quint16(p[0] << 8 | p[1]);
-    }
-    quint32 u32(int offset) const
-    {
-        return le ? quint32(u16(offset)) | quint32(u16(offset + 2)) << 16
-                  : quint32(u16(offset)) << 16 | u16(offset + 2);
-    }
-    // Entry i of the IFD at offset: tag, type, count, last word.
+    quint16 u16(int offset) const { return quint16(uchar(data.at(offset)) | uchar(data.at(offset + 1)) << 8); }
+    quint32 u32(int offset) const { return u16(offset) | quint32(u16(offset + 2)) << 16; }
+    // Entry i of the IFD at offset: tag, count, last word (raw or as a number).
     quint16 tag(int ifd, int i) const { return u16(ifd + 2 + 12 * i); }
-    quint16 type(int ifd, int i) const { return u16(ifd + 2 + 12 * i + 2); }
     quint32 count(int ifd, int i) const { return u32(ifd + 2 + 12 * i + 4); }
     quint32 word(int ifd, int i) const { return u32(ifd + 2 + 12 * i + 8); }
     QByteArray raw(int ifd, int i) const { return data.mid(ifd + 2 + 12 * i + 8, 4); }
 };
 
 // Builds a little-endian TIFF block by hand, for inputs our writer never makes.
-class TiffBuilder
+struct TiffBuilder
 {
-public:
     QByteArray data = QByteArray("II\x2a\0", 4);
 
-    TiffBuilder &u16(quint16 v)
-    {
-        data.append(char(v)).append(char(v >> 8));
-        return *this;
-    }
-    TiffBuilder &u32(quint32 v)
-    {
-        return u16(quint16(v)).u16(quint16(v >> 16));
-    }
+    TiffBuilder &u16(quint16 v) { return data.append(char(v)).append(char(v >> 8)), *this; }
+    TiffBuilder &u32(quint32 v) { return u16(quint16(v)).u16(quint16(v >> 16)); }
     TiffBuilder &entry(quint16 tag, quint16 type, quint32 count, quint32 word)
     {
         return u16(tag).u16(type).u32(count).u32(word);
-    }
-    TiffBuilder &pad(int size, char fill = 'x')
-    {
-        data.append(QByteArray(size, fill));
-        return *this;
     }
 };
 
@@ -88,6 +52,12 @@ QByteArray app1(const QByteArray &tiff)
     return QByteArray("\xff\xd8\xff\xe1", 4) + char(length >> 8) + char(length) + body + QByteArray("\xff\xd9", 2);
 }
 
+// A header read from a TIFF block.
+struct Reread : QExifImageHeader
+{
+    explicit Reread(const QByteArray &block) { read(block); }
+};
+
 } // namespace
 
 class tst_QExifImageHeader : public QObject
@@ -96,11 +66,9 @@ class tst_QExifImageHeader : public QObject
 
 private slots:
     void initTestCase();
-    void readsExiftoolFiles_data();
-    void readsExiftoolFiles();
+    void exiftoolRoundTrip_data();
+    void exiftoolRoundTrip();
     void onlyTheFirstApp1Counts();
-    void savedFilesReadByExiftool_data();
-    void savedFilesReadByExiftool();
     void blockLayout();
     void secondSaveRepeatsGpsPointer();
     void thumbnailLayout();
@@ -117,7 +85,7 @@ private slots:
     void saveFailuresKeepTheOriginal();
 
 private:
-    QString taggedFile(const QString &name, const QString &byteOrder, const QStringList &extra = QStringList());
+    QString taggedFile(const QString &name, const QString &byteOrder);
 
     QTemporaryDir m_dir;
     QString m_thumbnail;
@@ -126,146 +94,66 @@ private:
 void tst_QExifImageHeader::initTestCase()
 {
     QVERIFY(m_dir.isValid());
-    m_thumbnail = m_dir.filePath(QStringLiteral("thumb.jpg"));
+    m_thumbnail = m_dir.filePath("thumb.jpg");
     QVERIFY(makeJpeg(m_thumbnail, 16, 12, Qt::red));
 }
 
-QString tst_QExifImageHeader::taggedFile(const QString &name, const QString &byteOrder, const QStringList &extra)
+QString tst_QExifImageHeader::taggedFile(const QString &name, const QString &byteOrder)
 {
     const QString path = m_dir.filePath(name);
-    if (!makeJpeg(path))
-        return QString();
-    const QStringList arguments = QStringList{
-        QStringLiteral("-ExifByteOrder=") + byteOrder,
-        QStringLiteral("-Make=Acme"),
-        QStringLiteral("-Model=Cam 1"),
-        QStringLiteral("-Artist=Ann"),
-        QStringLiteral("-ImageDescription=A description longer than four"),
-        QStringLiteral("-Orientation#=6"),
-        QStringLiteral("-XResolution=300"),
-        QStringLiteral("-DateTimeOriginal=2024:05:06 07:08:09"),
-        QStringLiteral("-ExposureTime=0.01"),
-        QStringLiteral("-FNumber=2.8"),
-        QStringLiteral("-ISO=200"),
-        QStringLiteral("-ExposureCompensation=-0.5"),
-        QStringLiteral("-InteropIndex=R98"),
-        QStringLiteral("-GPSLatitude=33.5"),
-        QStringLiteral("-GPSLatitudeRef=S"),
-        QStringLiteral("-GPSLongitude=151.25"),
-        QStringLiteral("-GPSLongitudeRef=E"),
-        QStringLiteral("-GPSAltitude=12.5"),
-        QStringLiteral("-ThumbnailImage<=") + m_thumbnail,
-    } + extra;
-    return exiftoolWrite(path, arguments) ? path : QString();
+    const QStringList arguments{"-ExifByteOrder=" + byteOrder, "-Make=Acme", "-Model=Cam 1", "-Artist=Ann",
+                                "-Orientation#=6", "-XResolution=300", "-DateTimeOriginal=2024:05:06 07:08:09",
+                                "-ExposureTime=0.01", "-ISO=200", "-ExposureCompensation=-0.5", "-InteropIndex=R98",
+                                "-GPSLatitude=33.5", "-GPSLatitudeRef=S", "-GPSAltitude=12.5",
+                                "-ThumbnailImage<=" + m_thumbnail, "-XMP-dc:Title=Loom"};
+    return makeJpeg(path) && exiftoolWrite(path, arguments) ? path : QString();
 }
 
-void tst_QExifImageHeader::readsExiftoolFiles_data()
+void tst_QExifImageHeader::exiftoolRoundTrip_data()
 {
     QTest::addColumn<QString>("byteOrder");
     QTest::newRow("II") << QStringLiteral("II");
     QTest::newRow("MM") << QStringLiteral("MM");
 }
 
-void tst_QExifImageHeader::readsExiftoolFiles()
+void tst_QExifImageHeader::exiftoolRoundTrip()
 {
-    if (!TestSupport::hasProgram(QStringLiteral("exiftool")))
-        QSKIP("exiftool is not installed");
+    SKIP_WITHOUT_EXIFTOOL();
     QFETCH(QString, byteOrder);
-    const QString path = taggedFile(QStringLiteral("read-%1.jpg").arg(byteOrder), byteOrder);
+    const QString path = taggedFile(QStringLiteral("trip-%1.jpg").arg(byteOrder), byteOrder);
     QVERIFY(!path.isEmpty());
     const bool le = byteOrder == QLatin1String("II");
+    int scanStart = -1;
+    segments(readFile(path), &scanStart);
+    const QByteArray scan = readFile(path).mid(scanStart);
 
+    // Reading what exiftool wrote.
     QExifImageHeader header;
     QVERIFY(header.loadFromJpeg(path));
     QCOMPARE(header.byteOrder(), le ? QDataStream::LittleEndian : QDataStream::BigEndian);
-
     QCOMPARE(header.imageValue(271).toString(), QStringLiteral("Acme"));
-    QCOMPARE(header.imageValue(272).toString(), QStringLiteral("Cam 1"));
     QCOMPARE(header.imageValue(315).toString(), QStringLiteral("Ann")); // inline ASCII
-    QCOMPARE(header.imageValue(270).toString(), QStringLiteral("A description longer than four"));
     QCOMPARE(header.imageValue(274).toShort(), quint16(6));
     QCOMPARE(header.imageValue(282).toRational(), QExifURational(300, 1));
     QVERIFY(!header.containsImageTag(34665));
     QVERIFY(!header.containsImageTag(34853));
-
     QCOMPARE(header.extendedValue(36867).toString(), QStringLiteral("2024:05:06 07:08:09"));
     QCOMPARE(ratio(header.extendedValue(33434).toRational()), 0.01);
-    QCOMPARE(ratio(header.extendedValue(33437).toRational()), 2.8);
     QCOMPARE(header.extendedValue(34855).toShort(), quint16(200));
     QCOMPARE(ratio(header.extendedValue(37380).toSignedRational()), -0.5);
     QVERIFY(!header.containsExtendedTag(40965));
-
     // Short UNDEFINED values lie in the entry as a word: big-endian files
     // give them back reversed.
     QCOMPARE(header.extendedValue(36864).toByteArray(), le ? QByteArray("0232") : QByteArray("2320"));
-    QCOMPARE(header.extendedValue(37121).toByteArray(),
-             le ? QByteArray("\1\2\3\0", 4) : QByteArray("\0\3\2\1", 4));
-
     QCOMPARE(header.gpsValue(0).toByteVector(), (QVector<quint8>{2, 3, 0, 0}));
     QCOMPARE(header.gpsValue(1).toString(), QStringLiteral("S"));
     const QVector<QExifURational> latitude = header.gpsValue(2).toRationalVector();
     QCOMPARE(latitude.size(), 3);
     QCOMPARE(ratio(latitude[0]) + ratio(latitude[1]) / 60 + ratio(latitude[2]) / 3600, 33.5);
-    QCOMPARE(header.gpsValue(3).toString(), QStringLiteral("E"));
     QCOMPARE(ratio(header.gpsValue(6).toRational()), 12.5);
-
     QCOMPARE(header.thumbnailData(), readFile(m_thumbnail));
-    QVERIFY(!header.thumbnailXResolution().isNull());
-}
 
-void tst_QExifImageHeader::onlyTheFirstApp1Counts()
-{
-    if (!TestSupport::hasProgram(QStringLiteral("exiftool")))
-        QSKIP("exiftool is not installed");
-    const QString path = taggedFile(QStringLiteral("xmp.jpg"), QStringLiteral("II"),
-                                    {QStringLiteral("-XMP-dc:Title=Loom")});
-    QVERIFY(!path.isEmpty());
-    QExifImageHeader header;
-    QVERIFY(header.loadFromJpeg(path));
-
-    // Move the XMP segment ahead of the Exif one: now there is no Exif data.
-    int sos = -1;
-    const QByteArray jpeg = readFile(path);
-    QList<Segment> list = segments(jpeg, &sos);
-    int xmp = -1;
-    for (int i = 0; i < list.size(); ++i) {
-        if (list[i].marker == 0xffe1 && list[i].data.startsWith("http://ns.adobe.com/xap/1.0/"))
-            xmp = i;
-    }
-    QVERIFY(xmp > 0);
-    list.prepend(list.takeAt(xmp));
-    const QString reordered = m_dir.filePath(QStringLiteral("xmp-first.jpg"));
-    QVERIFY(writeFile(reordered, assemble(list, jpeg.mid(sos))));
-    QVERIFY(!exiftoolRead(reordered).value(QStringLiteral("IFD0:Make")).toString().isEmpty());
-    QVERIFY(!header.loadFromJpeg(reordered));
-    QVERIFY(header.imageTags().isEmpty());
-
-    // The corpus files whose APP1 holds XMP only.
-    for (const QString &name : {QStringLiteral("image01551.jpg"), QStringLiteral("image02206.jpg")})
-        QVERIFY(!header.loadFromJpeg(TestSupport::dataPath(QStringLiteral("exif/broken/") + name)));
-}
-
-void tst_QExifImageHeader::savedFilesReadByExiftool_data()
-{
-    QTest::addColumn<QString>("byteOrder");
-    QTest::newRow("II") << QStringLiteral("II");
-    QTest::newRow("MM") << QStringLiteral("MM");
-}
-
-void tst_QExifImageHeader::savedFilesReadByExiftool()
-{
-    if (!TestSupport::hasProgram(QStringLiteral("exiftool")))
-        QSKIP("exiftool is not installed");
-    QFETCH(QString, byteOrder);
-    const QString path = taggedFile(QStringLiteral("save-%1.jpg").arg(byteOrder), byteOrder,
-                                    {QStringLiteral("-XMP-dc:Title=Loom")});
-    QVERIFY(!path.isEmpty());
-    int scanStart = -1;
-    segments(readFile(path), &scanStart);
-    const QByteArray scan = readFile(path).mid(scanStart);
-
-    QExifImageHeader header;
-    QVERIFY(header.loadFromJpeg(path));
+    // Saving it again with some changes.
     header.setImageValue(271, QExifValue(QStringLiteral("Loomkit")));
     header.setExtendedValue(37510, QExifValue(QStringLiteral("hello"), QExifValue::AsciiEncoding));
     header.setExtendedValue(37382, QExifValue(QExifURational(5, 2)));
@@ -276,56 +164,68 @@ void tst_QExifImageHeader::savedFilesReadByExiftool()
     int sos = -1;
     const QByteArray saved = readFile(path);
     const QList<Segment> list = segments(saved, &sos);
-    QVERIFY(!list.isEmpty());
     QCOMPARE(list.first().marker, quint16(0xffe1));
     for (int i = 1; i < list.size(); ++i)
         QVERIFY2(list[i].marker < 0xffe0 || list[i].marker > 0xffef, qPrintable(QString::number(list[i].marker, 16)));
     QCOMPARE(saved.mid(sos), scan);
 
     const QJsonObject tags = exiftoolRead(path);
-    QVERIFY(!tags.contains(QStringLiteral("ExifTool:Error")));
-    const QJsonObject validation = exiftoolRead(path, {QStringLiteral("-validate"), QStringLiteral("-error")});
-    QVERIFY(validation.contains(QStringLiteral("ExifTool:Validate")));
-    QVERIFY(!validation.contains(QStringLiteral("ExifTool:Error")));
-    QCOMPARE(tags.value(QStringLiteral("ExifIFD:UserComment")).toString(), QStringLiteral("hello"));
-    QCOMPARE(tags.value(QStringLiteral("IFD0:Make")).toString(), QStringLiteral("Loomkit"));
-    QCOMPARE(tags.value(QStringLiteral("IFD0:Model")).toString(), QStringLiteral("Cam 1"));
-    QCOMPARE(tags.value(QStringLiteral("IFD0:Artist")).toString(), QStringLiteral("Ann"));
-    QCOMPARE(tags.value(QStringLiteral("IFD0:Orientation")).toInt(), 6);
-    QCOMPARE(tags.value(QStringLiteral("ExifIFD:DateTimeOriginal")).toString(), QStringLiteral("2024:05:06 07:08:09"));
-    QCOMPARE(tags.value(QStringLiteral("ExifIFD:ExposureTime")).toDouble(), 0.01);
-    QCOMPARE(tags.value(QStringLiteral("ExifIFD:FNumber")).toDouble(), 2.8);
-    QCOMPARE(tags.value(QStringLiteral("ExifIFD:ISO")).toInt(), 200);
-    QCOMPARE(tags.value(QStringLiteral("ExifIFD:ExposureCompensation")).toDouble(), -0.5);
-    QCOMPARE(tags.value(QStringLiteral("ExifIFD:SubjectDistance")).toDouble(), 2.5);
-    QCOMPARE(tags.value(QStringLiteral("GPS:GPSLatitude")).toDouble(), 33.5);
-    QCOMPARE(tags.value(QStringLiteral("GPS:GPSLatitudeRef")).toString(), QStringLiteral("S"));
-    QCOMPARE(tags.value(QStringLiteral("GPS:GPSLongitude")).toDouble(), 151.25);
-    QCOMPARE(tags.value(QStringLiteral("GPS:GPSAltitude")).toDouble(), 12.5);
-    QCOMPARE(tags.value(QStringLiteral("IFD1:ThumbnailLength")).toInt(), readFile(m_thumbnail).size());
+    const QJsonObject validation = exiftoolRead(path, {"-validate", "-error"});
+    QVERIFY(validation.contains("ExifTool:Validate"));
+    QVERIFY(!validation.contains("ExifTool:Error"));
+    QCOMPARE(tags.value("ExifIFD:UserComment").toString(), QStringLiteral("hello"));
+    QCOMPARE(tags.value("IFD0:Make").toString(), QStringLiteral("Loomkit"));
+    QCOMPARE(tags.value("IFD0:Model").toString(), QStringLiteral("Cam 1"));
+    QCOMPARE(tags.value("IFD0:Artist").toString(), QStringLiteral("Ann"));
+    QCOMPARE(tags.value("IFD0:Orientation").toInt(), 6);
+    QCOMPARE(tags.value("ExifIFD:ExposureTime").toDouble(), 0.01);
+    QCOMPARE(tags.value("ExifIFD:ISO").toInt(), 200);
+    QCOMPARE(tags.value("ExifIFD:ExposureCompensation").toDouble(), -0.5);
+    QCOMPARE(tags.value("ExifIFD:SubjectDistance").toDouble(), 2.5);
+    QCOMPARE(tags.value("GPS:GPSLatitude").toDouble(), 33.5);
+    QCOMPARE(tags.value("GPS:GPSLatitudeRef").toString(), QStringLiteral("S"));
     // The interoperability IFD and the XMP segment are not carried over.
-    QVERIFY(!tags.contains(QStringLiteral("InteropIFD:InteropIndex")));
-    QVERIFY(!tags.contains(QStringLiteral("XMP-dc:Title")));
-    // A big-endian file's short UNDEFINED values come back reversed and are
-    // written as they were read.
-    QCOMPARE(tags.value(QStringLiteral("ExifIFD:ExifVersion")).toVariant().toString(),
-             byteOrder == QLatin1String("II") ? QStringLiteral("0232") : QStringLiteral("2320"));
+    QVERIFY(!tags.contains("InteropIFD:InteropIndex"));
+    QVERIFY(!tags.contains("XMP-dc:Title"));
+    // Reversed short UNDEFINED values are written as they were read.
+    QCOMPARE(tags.value("ExifIFD:ExifVersion").toVariant().toString(),
+             le ? QStringLiteral("0232") : QStringLiteral("2320"));
+    QCOMPARE(TestSupport::run("exiftool", {"-b", "-ThumbnailImage", path}), readFile(m_thumbnail));
 
-    int exitCode = -1;
-    const QByteArray thumbnail = TestSupport::run(QStringLiteral("exiftool"),
-                                                  {QStringLiteral("-b"), QStringLiteral("-ThumbnailImage"), path},
-                                                  &exitCode);
-    QCOMPARE(thumbnail, readFile(m_thumbnail));
-
-    // What we wrote, we read back.
+    // What we wrote, we read back; the GPS pointer added on saving is dropped.
     QExifImageHeader again;
     QVERIFY(again.loadFromJpeg(path));
     QList<int> expectedTags = header.imageTags();
     expectedTags.removeAll(34853);
     QCOMPARE(again.imageTags(), expectedTags);
     QCOMPARE(again.extendedValue(37510).toString(), QStringLiteral("hello"));
-    QCOMPARE(again.gpsValue(2).toRationalVector(), header.gpsValue(2).toRationalVector());
+    QCOMPARE(again.gpsValue(2).toRationalVector(), latitude);
     QCOMPARE(again.thumbnailData(), header.thumbnailData());
+}
+
+void tst_QExifImageHeader::onlyTheFirstApp1Counts()
+{
+    SKIP_WITHOUT_EXIFTOOL();
+    const QString path = taggedFile(QStringLiteral("xmp-first.jpg"), QStringLiteral("II"));
+    QVERIFY(!path.isEmpty());
+    QExifImageHeader header;
+    QVERIFY(header.loadFromJpeg(path));
+
+    // Move the XMP segment ahead of the Exif one: now there is no Exif data.
+    QVERIFY(editSegments(path, [](QList<Segment> &list) {
+        for (int i = 1; i < list.size(); ++i) {
+            if (list[i].marker == 0xffe1 && list[i].data.startsWith("http://ns.adobe.com/xap/1.0/"))
+                list.prepend(list.takeAt(i));
+        }
+    }));
+    QVERIFY(readFile(path).mid(6).startsWith("http://ns.adobe.com/xap/1.0/"));
+    QVERIFY(!exiftoolRead(path).value("IFD0:Make").toString().isEmpty());
+    QVERIFY(!header.loadFromJpeg(path));
+    QVERIFY(header.imageTags().isEmpty());
+
+    // The corpus files whose APP1 holds XMP only.
+    for (const QString &name : {QStringLiteral("image01551.jpg"), QStringLiteral("image02206.jpg")})
+        QVERIFY(!header.loadFromJpeg(TestSupport::dataPath(QStringLiteral("exif/broken/") + name)));
 }
 
 void tst_QExifImageHeader::blockLayout()
@@ -336,55 +236,23 @@ void tst_QExifImageHeader::blockLayout()
     header.setExtendedValue(36864, QExifValue(QByteArray("0230")));
     header.setExtendedValue(33434, QExifValue(QExifURational(1, 100)));
 
-    // Without GPS data: IFD0 holds its entries and the Exif pointer.
-    Block block{header.toTiffBlock(), true};
-    QCOMPARE(block.data.left(8), QByteArray("II\x2a\0\x08\0\0\0", 8));
-    QCOMPARE(block.u16(8), quint16(3));
-    QCOMPARE(block.tag(8, 0), quint16(270));
+    // IFD0 holds its entries and the Exif pointer, then its values.
+    const Block block{header.toTiffBlock()};
+    QCOMPARE(block.data.left(10), QByteArray("II\x2a\0\x08\0\0\0\3\0", 10));
     QCOMPARE(block.raw(8, 0), QByteArray("abc\0", 4));
-    QCOMPARE(block.tag(8, 1), quint16(271));
     QCOMPARE(block.word(8, 1), 26u + 12 * 2);
-    QCOMPARE(block.tag(8, 2), quint16(34665));
     QCOMPARE(block.u32(8 + 2 + 36), 0u); // next IFD: no thumbnail
     QCOMPARE(block.data.mid(50, 10), QByteArray("Acme Corp\0", 10));
-    const quint32 exif = block.word(8, 2);
-    QCOMPARE(exif, 60u);
-    QCOMPARE(block.u16(int(exif)), quint16(2));
-    QCOMPARE(block.tag(int(exif), 0), quint16(33434));
-    QCOMPARE(block.word(int(exif), 0), exif + 2 + 24);
-    QCOMPARE(block.raw(int(exif), 1), QByteArray("0230"));
-    // The zero word follows the values, not the entries.
-    QCOMPARE(block.u32(int(exif) + 2 + 24), 1u);
-    QCOMPARE(block.u32(int(exif) + 2 + 24 + 8), 0u);
-    QCOMPARE(block.data.size(), int(exif) + 2 + 24 + 8 + 4);
+    const int exif = int(block.word(8, 2));
+    QCOMPARE(exif, 60);
+    QCOMPARE(block.word(exif, 0), quint32(exif + 2 + 24));
+    QCOMPARE(block.raw(exif, 1), QByteArray("0230"));
+    // In the Exif IFD the zero word follows the values, not the entries.
+    QCOMPARE(block.u32(exif + 2 + 24), 1u);
+    QCOMPARE(block.u32(exif + 2 + 24 + 8), 0u);
     QCOMPARE(header.size(), qint64(block.data.size()));
-
-    // With GPS data: one more pointer, and everything moves by 12.
-    header.setGpsValue(0, QExifValue(QVector<quint8>{2, 3, 0, 0}));
-    header.setGpsValue(2, QExifValue(QVector<QExifURational>{{33, 1}, {30, 1}, {0, 1}}));
-    header.setByteOrder(QDataStream::BigEndian);
-    block = Block{header.toTiffBlock(), false};
-    QCOMPARE(block.data.left(8), QByteArray("MM\0\x2a\0\0\0\x08", 8));
-    QCOMPARE(block.u16(8), quint16(4));
-    QCOMPARE(block.word(8, 1), 38u + 12 * 2);
-    QCOMPARE(block.tag(8, 3), quint16(34853));
-    const quint32 exifOffset = block.word(8, 2);
-    const quint32 gps = block.word(8, 3);
-    QCOMPARE(exifOffset, 72u);
-    QCOMPARE(gps, exifOffset + 2 + 12 + 20 + 4);
-    QCOMPARE(block.u16(int(gps)), quint16(2));
-    QCOMPARE(block.raw(int(gps), 0), QByteArray("\2\3\0\0", 4));
-    QCOMPARE(block.word(int(gps), 1), gps + 2 + 24);
-    QCOMPARE(block.u32(int(gps) + 2 + 24), 33u);
-    QCOMPARE(block.data.size(), int(gps) + 2 + 24 + 24 + 4);
-
-    // The block reads back into the same maps.
-    QExifImageHeader reread;
-    QVERIFY(reread.read(block.data));
-    QCOMPARE(reread.imageTags(), (QList<int>{270, 271}));
-    QCOMPARE(reread.extendedTags(), (QList<int>{33434, 36864}));
-    QCOMPARE(reread.gpsValue(2).toRationalVector(), header.gpsValue(2).toRationalVector());
-    QCOMPARE(reread.imageValue(271).toString(), QStringLiteral("Acme Corp"));
+    QCOMPARE(block.data.size(), exif + 2 + 24 + 8 + 4);
+    QCOMPARE(Reread(block.data).extendedTags(), (QList<int>{33434, 36864}));
 }
 
 void tst_QExifImageHeader::secondSaveRepeatsGpsPointer()
@@ -393,24 +261,20 @@ void tst_QExifImageHeader::secondSaveRepeatsGpsPointer()
     header.setImageValue(271, QExifValue(QStringLiteral("Acme")));
     header.setGpsValue(1, QExifValue(QStringLiteral("N")));
 
-    const Block first{header.toTiffBlock(), true};
+    const Block first{header.toTiffBlock()};
     QCOMPARE(first.u16(8), quint16(3));
-    QVERIFY(header.containsImageTag(34853));
-
-    const Block second{header.toTiffBlock(), true};
+    const Block second{header.toTiffBlock()};
     QCOMPARE(second.u16(8), quint16(4));
     QCOMPARE(second.tag(8, 1), quint16(34853)); // the stale copy, among the sorted entries
     QCOMPARE(second.word(8, 1), first.word(8, 2));
-    QCOMPARE(second.tag(8, 2), quint16(34665));
     QCOMPARE(second.tag(8, 3), quint16(34853));
     QCOMPARE(second.word(8, 3), first.word(8, 2) + 12);
     QCOMPARE(second.data.size(), first.data.size() + 12);
 
     // A reader drops both copies.
-    QExifImageHeader reread;
-    QVERIFY(reread.read(second.data));
-    QCOMPARE(reread.imageTags(), QList<int>{271});
-    QCOMPARE(reread.gpsValue(1).toString(), QStringLiteral("N"));
+    const Reread back(second.data);
+    QCOMPARE(back.imageTags(), QList<int>{271});
+    QCOMPARE(back.gpsValue(1).toString(), QStringLiteral("N"));
 }
 
 void tst_QExifImageHeader::thumbnailLayout()
@@ -420,67 +284,55 @@ void tst_QExifImageHeader::thumbnailLayout()
     header.setThumbnailData(thumbnail);
     header.setThumbnailXResolution(QExifValue(QExifURational(96, 1)));
 
-    const Block block{header.toTiffBlock(), true};
-    const quint32 ifd1 = block.u32(8 + 2 + 12);
-    QCOMPARE(ifd1, quint32(8 + 2 + 12 + 4 + 2 + 4));
-    QCOMPARE(block.u16(int(ifd1)), quint16(7));
-    const QList<quint16> tags{259, 282, 283, 296, 274, 513, 514};
-    for (int i = 0; i < tags.size(); ++i)
-        QCOMPARE(block.tag(int(ifd1), i), tags[i]);
-    QCOMPARE(block.word(int(ifd1), 0), 6u);
-    QCOMPARE(block.word(int(ifd1), 1), ifd1 + 86);
-    QCOMPARE(block.u32(int(ifd1) + 86), 96u);
-    QCOMPARE(block.word(int(ifd1), 2), ifd1 + 94);
-    QCOMPARE(block.u32(int(ifd1) + 94), 72u); // default resolution
-    QCOMPARE(block.word(int(ifd1), 3), 2u);
-    QCOMPARE(block.word(int(ifd1), 4), 0u); // default orientation
-    QCOMPARE(block.word(int(ifd1), 5), ifd1 + 102);
-    QCOMPARE(block.word(int(ifd1), 6), quint32(thumbnail.size()));
-    QCOMPARE(block.data.mid(int(ifd1) + 102), thumbnail);
-
-    QExifImageHeader reread;
-    QVERIFY(reread.read(block.data));
-    QCOMPARE(reread.thumbnailData(), thumbnail);
-    QCOMPARE(reread.thumbnailXResolution().toRational(), QExifURational(96, 1));
-    QCOMPARE(reread.thumbnailOrientation().toShort(), quint16(0));
+    // IFD1 follows IFD0 and its next word; the data comes last.
+    const Block block{header.toTiffBlock()};
+    const int ifd1 = int(block.u32(8 + 2 + 12));
+    QCOMPARE(ifd1, 8 + 2 + 12 + 4 + 2 + 4);
+    QCOMPARE(block.u16(ifd1), quint16(7));
+    QVERIFY(block.data.endsWith(thumbnail));
+    // Unset values get defaults: 72 dpi and orientation 0.
+    Reread back(block.data);
+    QCOMPARE(back.thumbnailData(), thumbnail);
+    QCOMPARE(back.thumbnailXResolution().toRational(), QExifURational(96, 1));
+    QCOMPARE(back.thumbnailYResolution().toRational(), QExifURational(72, 1));
+    QCOMPARE(back.thumbnailOrientation().toShort(), quint16(0));
+    QCOMPARE(back.thumbnailOrientation().type(), int(QExifValue::Short));
     // clear keeps the thumbnail's values but drops its data.
-    reread.clear();
-    QVERIFY(reread.thumbnailData().isEmpty());
-    QCOMPARE(reread.thumbnailXResolution().toRational(), QExifURational(96, 1));
-    QCOMPARE(reread.size(), qint64(-1));
+    back.clear();
+    QVERIFY(back.thumbnailData().isEmpty());
+    QCOMPARE(back.thumbnailXResolution().toRational(), QExifURational(96, 1));
+    QCOMPARE(back.size(), qint64(-1));
 }
 
 void tst_QExifImageHeader::inlineValues_data()
 {
     QTest::addColumn<QExifValue>("value");
-    QTest::addColumn<bool>("isInline");
-    QTest::addColumn<QByteArray>("inlineBytes");
+    QTest::addColumn<QByteArray>("inlineBytes"); // empty: out of line
 
-    QTest::newRow("ascii of 4 with terminator") << QExifValue(QStringLiteral("abc")) << true << QByteArray("abc\0", 4);
-    QTest::newRow("ascii of 5") << QExifValue(QStringLiteral("abcd")) << false << QByteArray();
-    QTest::newRow("byte x4") << QExifValue(QVector<quint8>{1, 2, 3, 4}) << true << QByteArray("\1\2\3\4", 4);
-    QTest::newRow("byte x5") << QExifValue(QVector<quint8>{1, 2, 3, 4, 5}) << false << QByteArray();
-    QTest::newRow("short x1 padded") << QExifValue(quint16(0x0102)) << true << QByteArray("\2\1\0\0", 4);
-    QTest::newRow("short x3") << QExifValue(QVector<quint16>{1, 2, 3}) << false << QByteArray();
-    QTest::newRow("long x0") << QExifValue(QVector<quint32>()) << true << QByteArray(4, '\0');
-    QTest::newRow("long x2") << QExifValue(QVector<quint32>{1, 2}) << false << QByteArray();
-    QTest::newRow("rational x0") << QExifValue(QVector<QExifURational>()) << true << QByteArray(4, '\0');
-    QTest::newRow("rational x1 never inline") << QExifValue(QExifURational(1, 1)) << false << QByteArray();
-    QTest::newRow("undefined x2 padded") << QExifValue(QByteArray("ab")) << true << QByteArray("ab\0\0", 4);
+    QTest::newRow("ascii of 4 with terminator") << QExifValue(QStringLiteral("abc")) << QByteArray("abc\0", 4);
+    QTest::newRow("ascii of 5") << QExifValue(QStringLiteral("abcd")) << QByteArray();
+    QTest::newRow("byte x4") << QExifValue(QVector<quint8>{1, 2, 3, 4}) << QByteArray("\1\2\3\4", 4);
+    QTest::newRow("byte x5") << QExifValue(QVector<quint8>{1, 2, 3, 4, 5}) << QByteArray();
+    QTest::newRow("short x1 padded") << QExifValue(quint16(0x0102)) << QByteArray("\2\1\0\0", 4);
+    QTest::newRow("short x3") << QExifValue(QVector<quint16>{1, 2, 3}) << QByteArray();
+    QTest::newRow("long x0") << QExifValue(QVector<quint32>()) << QByteArray(4, '\0');
+    QTest::newRow("long x2") << QExifValue(QVector<quint32>{1, 2}) << QByteArray();
+    QTest::newRow("rational x0") << QExifValue(QVector<QExifURational>()) << QByteArray(4, '\0');
+    QTest::newRow("rational x1 never inline") << QExifValue(QExifURational(1, 1)) << QByteArray();
+    QTest::newRow("undefined x2 padded") << QExifValue(QByteArray("ab")) << QByteArray("ab\0\0", 4);
 }
 
 void tst_QExifImageHeader::inlineValues()
 {
     QFETCH(QExifValue, value);
-    QFETCH(bool, isInline);
     QFETCH(QByteArray, inlineBytes);
 
     QExifImageHeader header;
     header.setImageValue(700, value);
-    const Block block{header.toTiffBlock(), true};
+    const Block block{header.toTiffBlock()};
     const quint32 valuesStart = 26 + 12;
     QCOMPARE(block.count(8, 0), value.count());
-    if (isInline) {
+    if (!inlineBytes.isEmpty()) {
         QCOMPARE(block.raw(8, 0), inlineBytes);
         QCOMPARE(block.word(8, 1), valuesStart);
     } else {
@@ -491,19 +343,13 @@ void tst_QExifImageHeader::inlineValues()
     // Whatever the form, the value reads back as written, in both orders.
     for (QDataStream::ByteOrder order : {QDataStream::LittleEndian, QDataStream::BigEndian}) {
         header.setByteOrder(order);
-        QExifImageHeader reread;
-        QVERIFY(reread.read(header.toTiffBlock()));
-        const QExifValue back = reread.imageValue(700);
-        QCOMPARE(back.type(), value.type());
+        const QExifValue back = Reread(header.toTiffBlock()).imageValue(700);
         QCOMPARE(back.count(), value.count());
+        // Big-endian: a short UNDEFINED value comes back as the reversed word's first bytes.
         if (value.type() == QExifValue::Undefined && order == QDataStream::BigEndian)
-            QCOMPARE(back.toByteArray(), QByteArray("\0\0", 2)); // reversed word, first two bytes
-        else if (value.type() == QExifValue::Undefined)
-            QCOMPARE(back.toByteArray(), value.toByteArray());
-        QCOMPARE(back.toString(), value.toString());
-        QCOMPARE(back.toShortVector(), value.toShortVector());
-        QCOMPARE(back.toRationalVector(), value.toRationalVector());
-        QCOMPARE(back.toByteVector(), value.toByteVector());
+            QCOMPARE(describe(back), QStringLiteral("7:%00%00"));
+        else
+            QCOMPARE(describe(back), describe(value));
     }
 }
 
@@ -516,25 +362,23 @@ void tst_QExifImageHeader::unknownTypeWarns()
     header.setGpsValue(1, QExifValue(QStringLiteral("N")));
     QTest::ignoreMessage(QtWarningMsg, QRegularExpression(QStringLiteral("Invalid Ifd Type 0$")));
     QTest::ignoreMessage(QtWarningMsg, QRegularExpression(QStringLiteral("Invalid Ifd Type 0$")));
-    const Block block{header.toTiffBlock(), true};
+    const Block block{header.toTiffBlock()};
     QCOMPARE(block.tag(8, 0), quint16(300));
-    QCOMPARE(block.type(8, 0), quint16(0));
+    QCOMPARE(block.u16(8 + 2 + 2), quint16(0)); // type
     QCOMPARE(block.word(8, 0), 0u);
     // The unknown entry takes 12 bytes but counts as none in the layout, so
     // the GPS pointer falls 12 bytes short of where its IFD lies.
-    const quint32 exif = block.word(8, 1);
     const quint32 gps = block.word(8, 2);
-    QCOMPARE(gps, exif + 2 + 20 + 4);
+    QCOMPARE(gps, block.word(8, 1) + 2 + 20 + 4);
     QCOMPARE(block.u16(int(gps) + 12), quint16(1));
 
     // The reader keeps a null value under an unknown type's tag.
     TiffBuilder tiff;
     tiff.u32(8).u16(1).entry(400, 13, 1, 5).u32(0);
-    QExifImageHeader reread;
     QTest::ignoreMessage(QtWarningMsg, QRegularExpression(QStringLiteral("Invalid Ifd Type 13$")));
-    QVERIFY(reread.read(tiff.data));
-    QVERIFY(reread.containsImageTag(400));
-    QVERIFY(reread.imageValue(400).isNull());
+    const Reread back(tiff.data);
+    QVERIFY(back.containsImageTag(400));
+    QVERIFY(back.imageValue(400).isNull());
 }
 
 void tst_QExifImageHeader::cameraFiles_data()
@@ -551,15 +395,14 @@ void tst_QExifImageHeader::cameraFiles_data()
 
 void tst_QExifImageHeader::cameraFiles()
 {
-    if (!TestSupport::hasProgram(QStringLiteral("exiftool")))
-        QSKIP("exiftool is not installed");
+    SKIP_WITHOUT_EXIFTOOL();
     QFETCH(QString, path);
     const QJsonObject tags = exiftoolRead(path);
     QVERIFY(!tags.isEmpty());
 
     QExifImageHeader header;
     QVERIFY(header.loadFromJpeg(path));
-    const QString order = tags.value(QStringLiteral("File:ExifByteOrder")).toString();
+    const QString order = tags.value("File:ExifByteOrder").toString();
     QCOMPARE(header.byteOrder(), order == QLatin1String("II") ? QDataStream::LittleEndian : QDataStream::BigEndian);
 
     // exiftool trims trailing blanks and NULs; we drop the last byte of the
@@ -569,61 +412,53 @@ void tst_QExifImageHeader::cameraFiles()
         const QString actual = QString(ours).remove(QChar(0)).trimmed();
         return expected.startsWith(actual) && expected.size() - actual.size() <= 1;
     };
-    const auto compareText = [&](int tag, const QString &key) {
-        const QJsonValue expected = tags.value(key);
-        if (expected.isUndefined())
-            QVERIFY(!header.containsImageTag(tag));
-        else
-            QVERIFY2(sameText(header.imageValue(tag).toString(), expected), qPrintable(key));
-    };
-    compareText(271, QStringLiteral("IFD0:Make"));
-    compareText(272, QStringLiteral("IFD0:Model"));
-    compareText(306, QStringLiteral("IFD0:ModifyDate"));
-    if (tags.contains(QStringLiteral("IFD0:Orientation")))
-        QCOMPARE(int(header.imageValue(274).toShort()), tags.value(QStringLiteral("IFD0:Orientation")).toInt());
-    if (tags.contains(QStringLiteral("ExifIFD:DateTimeOriginal")))
-        QVERIFY(sameText(header.extendedValue(36867).toString(), tags.value(QStringLiteral("ExifIFD:DateTimeOriginal"))));
-    if (tags.contains(QStringLiteral("ExifIFD:ExposureTime"))) {
-        const double expected = tags.value(QStringLiteral("ExifIFD:ExposureTime")).toDouble();
-        QVERIFY(qAbs(ratio(header.extendedValue(33434).toRational()) - expected) <= expected * 1e-9);
+    const auto has = [&](const char *key) { return tags.contains(QLatin1String(key)); };
+    const auto tag = [&](const char *key) { return tags.value(QLatin1String(key)); };
+    const QList<QPair<int, const char *>> texts{{271, "IFD0:Make"}, {272, "IFD0:Model"}, {306, "IFD0:ModifyDate"}};
+    for (const auto &text : texts) {
+        if (has(text.second))
+            QVERIFY2(sameText(header.imageValue(text.first).toString(), tag(text.second)), text.second);
+        else QVERIFY(!header.containsImageTag(text.first));
     }
-    if (tags.contains(QStringLiteral("GPS:GPSLatitude"))) {
+    if (has("IFD0:Orientation"))
+        QCOMPARE(int(header.imageValue(274).toShort()), tag("IFD0:Orientation").toInt());
+    if (has("ExifIFD:DateTimeOriginal"))
+        QVERIFY(sameText(header.extendedValue(36867).toString(), tag("ExifIFD:DateTimeOriginal")));
+    if (has("GPS:GPSLatitude")) {
         const QVector<QExifURational> v = header.gpsValue(2).toRationalVector();
         QCOMPARE(v.size(), 3);
         const double degrees = ratio(v[0]) + ratio(v[1]) / 60 + ratio(v[2]) / 3600;
-        QVERIFY(qAbs(degrees - tags.value(QStringLiteral("GPS:GPSLatitude")).toDouble()) < 1e-6);
+        QVERIFY(qAbs(degrees - tag("GPS:GPSLatitude").toDouble()) < 1e-6);
     }
-    const int thumbnailLength = tags.value(QStringLiteral("IFD1:ThumbnailLength")).toInt();
-    if (tags.value(QStringLiteral("IFD1:ThumbnailOffset")).isDouble() && thumbnailLength > 0) {
+    const int thumbnailLength = tag("IFD1:ThumbnailLength").toInt();
+    if (tag("IFD1:ThumbnailOffset").isDouble() && thumbnailLength > 0)
         QCOMPARE(header.thumbnailData().size(), thumbnailLength);
-        QVERIFY(header.thumbnailData().startsWith("\xff\xd8"));
-    }
     // Every IFD0 tag exiftool lists is in the map.
     int listed = 0;
     for (auto it = tags.begin(); it != tags.end(); ++it)
         listed += it.key().startsWith(QLatin1String("IFD0:")) ? 1 : 0;
-    QVERIFY2(header.imageTags().size() >= listed, qPrintable(QStringLiteral("%1 < %2").arg(header.imageTags().size()).arg(listed)));
+    QVERIFY2(header.imageTags().size() >= listed, qPrintable(QString::number(header.imageTags().size())));
 
     // Rewriting keeps the values a reader can see. Files with no image
     // data (SOI, APP1, EOI) are refused and stay as they were.
-    const QString copy = m_dir.filePath(QStringLiteral("camera-copy.jpg"));
+    const QString copy = m_dir.filePath("camera-copy.jpg");
     QFile::remove(copy);
     QVERIFY(QFile::copy(path, copy));
     QFile::setPermissions(copy, QFile::ReadOwner | QFile::WriteOwner);
-    if (!tags.contains(QStringLiteral("File:ImageWidth"))) {
+    if (!has("File:ImageWidth")) {
         QVERIFY(!header.saveToJpeg(copy));
         QCOMPARE(readFile(copy), readFile(path));
         return;
     }
     QVERIFY(header.saveToJpeg(copy));
     const QJsonObject rewritten = exiftoolRead(copy);
-    QVERIFY(!rewritten.contains(QStringLiteral("ExifTool:Error")));
-    for (const QString &key : {QStringLiteral("IFD0:Model"), QStringLiteral("ExifIFD:DateTimeOriginal")}) {
-        if (tags.contains(key))
-            QVERIFY2(sameText(rewritten.value(key).toVariant().toString(), tags.value(key)), qPrintable(key));
+    QVERIFY(!rewritten.contains("ExifTool:Error"));
+    for (const char *key : {"IFD0:Model", "ExifIFD:DateTimeOriginal"}) {
+        if (has(key))
+            QVERIFY2(sameText(rewritten.value(QLatin1String(key)).toVariant().toString(), tag(key)), key);
     }
-    QCOMPARE(rewritten.value(QStringLiteral("GPS:GPSLatitude")), tags.value(QStringLiteral("GPS:GPSLatitude")));
-    QCOMPARE(rewritten.value(QStringLiteral("File:ImageWidth")), tags.value(QStringLiteral("File:ImageWidth")));
+    QCOMPARE(rewritten.value("GPS:GPSLatitude"), tag("GPS:GPSLatitude"));
+    QCOMPARE(rewritten.value("File:ImageWidth"), tag("File:ImageWidth"));
 }
 
 void tst_QExifImageHeader::hostileInputs_data()
@@ -665,12 +500,10 @@ void tst_QExifImageHeader::hostileInputs()
     // No value holds more than the input has bytes.
     qint64 total = header.thumbnailData().size();
     for (const QExifImageHeader *h : {&header, &wrapped}) {
-        for (int tag : h->imageTags())
-            total += h->imageValue(tag).count();
-        for (int tag : h->extendedTags())
-            total += h->extendedValue(tag).count();
-        for (int tag : h->gpsTags())
-            total += h->gpsValue(tag).count();
+        for (auto group : {QExifImageHeader::ImageGroup, QExifImageHeader::ExtendedGroup, QExifImageHeader::GpsGroup}) {
+            for (int tag : h->tags(group))
+                total += h->value(group, tag).count();
+        }
     }
     QVERIFY2(total <= 2 * data.size() + 64, qPrintable(QString::number(total)));
     if (!loaded)
@@ -680,66 +513,49 @@ void tst_QExifImageHeader::hostileInputs()
 void tst_QExifImageHeader::hardening_data()
 {
     QTest::addColumn<QByteArray>("jpeg");
-    QTest::addColumn<bool>("loaded");
-    QTest::addColumn<QList<int>>("imageTags");
+    QTest::addColumn<QList<int>>("imageTags"); // empty: the load fails
     QTest::addColumn<QList<int>>("extendedTags");
     QTest::addColumn<int>("thumbnailSize");
 
-    QTest::newRow("segment length 0") << QByteArray("\xff\xd8\xff\xe0\0\0\xff\xe1\0\0", 10) << false << QList<int>()
-                                      << QList<int>() << 0;
-    QTest::newRow("segment length 1") << QByteArray("\xff\xd8\xff\xdb\0\x01xxxx", 10) << false << QList<int>()
-                                      << QList<int>() << 0;
-    QTest::newRow("walk runs off the end") << QByteArray("\xff\xd8\xff\xe0\0\x10JFIF", 10) << false << QList<int>()
-                                           << QList<int>() << 0;
-    QTest::newRow("only SOI") << QByteArray("\xff\xd8", 2) << false << QList<int>() << QList<int>() << 0;
-    QTest::newRow("no SOI") << QByteArray("\xff\xe1\0\x10" "Exif\0\0II*\0", 14) << false << QList<int>() << QList<int>()
-                            << 0;
-    QTest::newRow("APP1 shorter than its signature")
-        << QByteArray("\xff\xd8\xff\xe1\0\x06Exif\0\0", 12) << false << QList<int>() << QList<int>() << 0;
-
-    TiffBuilder outside;
-    outside.u32(4000).u16(0);
-    QTest::newRow("IFD0 outside the block") << app1(outside.data) << false << QList<int>() << QList<int>() << 0;
+    const auto refused = [](const char *name, const QByteArray &jpeg) {
+        QTest::newRow(name) << jpeg << QList<int>() << QList<int>() << 0;
+    };
+    refused("segment length 0", QByteArray("\xff\xd8\xff\xe0\0\0\xff\xe1\0\0", 10));
+    refused("segment length 1", QByteArray("\xff\xd8\xff\xdb\0\x01xxxx", 10));
+    refused("walk runs off the end", QByteArray("\xff\xd8\xff\xe0\0\x10JFIF", 10));
+    refused("only SOI", QByteArray("\xff\xd8", 2));
+    refused("no SOI", QByteArray("\xff\xe1\0\x10" "Exif\0\0II*\0", 14));
+    refused("APP1 shorter than its signature", QByteArray("\xff\xd8\xff\xe1\0\x06Exif\0\0", 12));
+    refused("IFD0 outside the block", app1(TiffBuilder().u32(4000).u16(0).data));
+    refused("bad magic", app1(QByteArray("II\x2b\0\x08\0\0\0\0\0", 10)));
+    refused("bad byte order", app1(QByteArray("IM\x2a\0\x08\0\0\0\0\0", 10)));
 
     TiffBuilder past;
     past.u32(8).u16(3).entry(270, 2, 1000, 20).entry(273, 4, 0x40000000, 8).entry(274, 3, 1, 6).u32(0);
-    QTest::newRow("counts past the block") << app1(past.data) << true << QList<int>{270, 273, 274} << QList<int>() << 0;
-
+    QTest::newRow("counts past the block") << app1(past.data) << QList<int>{270, 273, 274} << QList<int>() << 0;
     TiffBuilder truncated;
     truncated.u32(8).u16(50).entry(271, 2, 2, 0x41).entry(272, 2, 2, 0x42);
-    QTest::newRow("IFD cut short") << app1(truncated.data) << true << QList<int>{271, 272} << QList<int>() << 0;
-
+    QTest::newRow("IFD cut short") << app1(truncated.data) << QList<int>{271, 272} << QList<int>() << 0;
     TiffBuilder selfLoop;
     selfLoop.u32(8).u16(2).entry(271, 2, 2, 0x41).entry(34665, 4, 1, 8).u32(8);
-    QTest::newRow("IFDs pointing back at IFD0") << app1(selfLoop.data) << true << QList<int>{271} << QList<int>() << 0;
-
+    QTest::newRow("IFDs pointing back at IFD0") << app1(selfLoop.data) << QList<int>{271} << QList<int>() << 0;
     TiffBuilder exifLoop;
     exifLoop.u32(8).u16(3).entry(271, 2, 2, 0x41).entry(34665, 4, 1, 50).entry(34853, 4, 1, 50).u32(50);
     exifLoop.u16(1).entry(33434, 4, 1, 9).u32(0);
-    QTest::newRow("GPS and IFD1 at the Exif IFD")
-        << app1(exifLoop.data) << true << QList<int>{271} << QList<int>{33434} << 0;
-
+    QTest::newRow("GPS and IFD1 at the Exif IFD") << app1(exifLoop.data) << QList<int>{271} << QList<int>{33434} << 0;
     TiffBuilder thumbnail;
     thumbnail.u32(8).u16(1).entry(271, 2, 2, 0x41).u32(26);
     thumbnail.u16(2).entry(513, 4, 1, 0x7ffffff0).entry(514, 4, 1, 0x7fffffff).u32(0);
-    QTest::newRow("thumbnail outside the block") << app1(thumbnail.data) << true << QList<int>{271} << QList<int>()
-                                                 << 0;
-
+    QTest::newRow("thumbnail outside the block") << app1(thumbnail.data) << QList<int>{271} << QList<int>() << 0;
     TiffBuilder good;
     good.u32(8).u16(1).entry(271, 2, 2, 0x41).u32(26);
     good.u16(2).entry(513, 4, 1, 56).entry(514, 4, 1, 4).u32(0).data.append("\xff\xd8\xff\xd9");
-    QTest::newRow("thumbnail inside the block") << app1(good.data) << true << QList<int>{271} << QList<int>() << 4;
-
-    QTest::newRow("bad magic") << app1(QByteArray("II\x2b\0\x08\0\0\0\0\0", 10)) << false << QList<int>()
-                               << QList<int>() << 0;
-    QTest::newRow("bad byte order") << app1(QByteArray("IM\x2a\0\x08\0\0\0\0\0", 10)) << false << QList<int>()
-                                    << QList<int>() << 0;
+    QTest::newRow("thumbnail inside the block") << app1(good.data) << QList<int>{271} << QList<int>() << 4;
 }
 
 void tst_QExifImageHeader::hardening()
 {
     QFETCH(QByteArray, jpeg);
-    QFETCH(bool, loaded);
     QFETCH(QList<int>, imageTags);
     QFETCH(QList<int>, extendedTags);
     QFETCH(int, thumbnailSize);
@@ -747,7 +563,7 @@ void tst_QExifImageHeader::hardening()
     QBuffer buffer(&jpeg);
     QVERIFY(buffer.open(QIODevice::ReadOnly));
     QExifImageHeader header;
-    QCOMPARE(header.loadFromJpeg(&buffer), loaded);
+    QCOMPARE(header.loadFromJpeg(&buffer), !imageTags.isEmpty());
     QCOMPARE(header.imageTags(), imageTags);
     QCOMPARE(header.extendedTags(), extendedTags);
     QVERIFY(header.gpsTags().isEmpty());
@@ -766,14 +582,12 @@ void tst_QExifImageHeader::sharedValuesDontMultiplyMemory()
     // reads it, as the values may not take more bytes than the block holds.
     TiffBuilder tiff;
     const int entries = 2000;
-    const quint32 valueOffset = 8 + 2 + 12 * entries + 4;
     tiff.u32(8).u16(entries);
     for (int i = 0; i < entries; ++i)
-        tiff.entry(quint16(1000 + i), 7, 40000, valueOffset);
-    tiff.u32(0).pad(40000);
+        tiff.entry(quint16(1000 + i), 7, 40000, 8 + 2 + 12 * entries + 4);
+    tiff.u32(0).data.append(QByteArray(40000, 'x'));
 
-    QExifImageHeader header;
-    QVERIFY(header.read(tiff.data));
+    const Reread header(tiff.data);
     QCOMPARE(header.imageTags().size(), entries);
     int full = 0;
     for (int tag : header.imageTags())
@@ -783,38 +597,35 @@ void tst_QExifImageHeader::sharedValuesDontMultiplyMemory()
 
 void tst_QExifImageHeader::saveFailuresKeepTheOriginal()
 {
-    const QString text = m_dir.filePath(QStringLiteral("not-a-jpeg.jpg"));
+    const QString text = m_dir.filePath("not-a-jpeg.jpg");
     QVERIFY(writeFile(text, QByteArray("plain text, no image")));
     QExifImageHeader header;
     header.setImageValue(271, QExifValue(QStringLiteral("Acme")));
     QVERIFY(!header.saveToJpeg(text));
     QCOMPARE(readFile(text), QByteArray("plain text, no image"));
-    QVERIFY(!QFile::exists(text + QLatin1String(".tmp")));
 
     // A JPEG cut before its scan: the copy runs out and the save fails.
-    const QString jpeg = m_dir.filePath(QStringLiteral("cut.jpg"));
+    const QString jpeg = m_dir.filePath("cut.jpg");
     QVERIFY(makeJpeg(jpeg));
     const QByteArray whole = readFile(jpeg);
     const QByteArray cut = whole.left(whole.indexOf("\xff\xda"));
     QVERIFY(writeFile(jpeg, cut));
     QVERIFY(!header.saveToJpeg(jpeg));
     QCOMPARE(readFile(jpeg), cut);
-    QVERIFY(!QFile::exists(jpeg + QLatin1String(".tmp")));
-
-    QVERIFY(!header.saveToJpeg(m_dir.filePath(QStringLiteral("missing.jpg"))));
-    QVERIFY(!QFile::exists(m_dir.filePath(QStringLiteral("missing.jpg.tmp"))));
+    QVERIFY(!header.saveToJpeg(m_dir.filePath("missing.jpg")));
+    for (const QString &path : {text, jpeg, m_dir.filePath("missing.jpg")})
+        QVERIFY(!QFile::exists(path + QLatin1String(".tmp")));
 
     // A block too large for one segment is refused, not wrapped.
-    QVERIFY(makeJpeg(jpeg));
-    const QByteArray original = readFile(jpeg);
+    QVERIFY(writeFile(jpeg, whole));
     header.setThumbnailData(QByteArray(70000, 'x'));
     QTest::ignoreMessage(QtWarningMsg, QRegularExpression(QStringLiteral("Exif block too large")));
     QVERIFY(!header.saveToJpeg(jpeg));
-    QCOMPARE(readFile(jpeg), original);
+    QCOMPARE(readFile(jpeg), whole);
 
     // A sequential source is refused.
     header.setThumbnailData(QByteArray());
-    QByteArray source = original;
+    QByteArray source = whole;
     SequentialBuffer sequential(&source);
     QVERIFY(sequential.open(QIODevice::ReadOnly));
     QBuffer sink;
