@@ -10,7 +10,7 @@ BUILD=${LOOMKIT_BUILD_DIR:-build}
 COUNT=${EXIF_BENCH_FILES:-500}
 RUNS=${EXIF_BENCH_RUNS:-3}
 DATA=$BUILD/bench-data/exif
-SOURCES=tests/data/exif/camera
+SOURCES=tests/fixtures/exif/camera
 
 [ -f "$BUILD/CMakeCache.txt" ] || cmake -S . -B "$BUILD" -G Ninja -DCMAKE_BUILD_TYPE=RelWithDebInfo >/dev/null
 cmake --build "$BUILD" --target bench_exif_read bench_exif_images >/dev/null

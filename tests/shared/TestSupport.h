@@ -5,7 +5,7 @@
 
 namespace TestSupport {
 
-// Folder of the committed test data (tests/data).
+// Folder of the committed test data (tests/fixtures).
 QString dataPath(const QString &relativePath = QString());
 
 // True if an external program is on PATH; oracle tests skip without it.
