@@ -291,9 +291,7 @@ bool CsvParser::parse()
         m_headers.clear();
     m_line = 1;
     m_column = 1;
-    m_dateTimeSlots.reset();
-    m_dateTimeSlotCount = 0;
-    m_dateTimeMisses = 0;
+    m_dateTimes.clear();
 
     if (!m_hasFixedFields && !readHeaderRow()) {
         close();
@@ -811,7 +809,7 @@ QVariant CsvParser::plainValue(const QChar *begin, int size, bool isNull) const
 
     if (m_dateTimeFormat.isEmpty()) {
         if (mayBeIsoDate(begin, size)) {
-            const QDateTime dateTime = isoDateTime(begin, size);
+            const QDateTime dateTime = m_dateTimes.fromIsoText(begin, size);
             if (dateTime.isValid())
                 return QVariant(dateTime);
         }
@@ -841,41 +839,6 @@ QVariant CsvParser::plainValue(const QChar *begin, int size, bool isNull) const
     if (ok)
         return QVariant(real);
     return QVariant(text);
-}
-
-// Turning a local date-time into an instant costs a time zone lookup in the
-// C library, far more than the rest of a field; columns of dates repeat, so
-// a two-way cache remembers recent texts. Keys live in the slots themselves,
-// so a look-up touches one cache line.
-QDateTime CsvParser::isoDateTime(const QChar *begin, int size) const
-{
-    if (size > DateTimeSlot::kMaximumText)
-        return QDateTime::fromString(QString(begin, size), Qt::ISODate);
-    uint hash = 2166136261u;
-    for (int i = 0; i < size; ++i)
-        hash = (hash ^ begin[i].unicode()) * 16777619u;
-    // Small at first; a column of many distinct dates makes it grow.
-    if (m_dateTimeMisses >= m_dateTimeSlotCount && m_dateTimeSlotCount < kMaximumDateTimeSlots) {
-        m_dateTimeSlotCount = m_dateTimeSlotCount == 0 ? 256 : m_dateTimeSlotCount * 8;
-        m_dateTimeSlots.reset(new DateTimeSlot[m_dateTimeSlotCount]);
-        m_dateTimeMisses = 0;
-    }
-    const uint index = (hash ^ (hash >> 15)) & uint(m_dateTimeSlotCount - 2);
-    DateTimeSlot *pair = m_dateTimeSlots.get() + index;
-    for (int way = 0; way < 2; ++way) {
-        DateTimeSlot &slot = pair[way];
-        if (slot.size == size && std::equal(begin, begin + size, slot.text)) {
-            slot.age = ++m_dateTimeClock;
-            return slot.dateTime;
-        }
-    }
-    ++m_dateTimeMisses;
-    DateTimeSlot &slot = pair[0].age <= pair[1].age ? pair[0] : pair[1];
-    std::copy(begin, begin + size, slot.text);
-    slot.size = size;
-    slot.age = ++m_dateTimeClock;
-    slot.dateTime = QDateTime::fromString(QString(begin, size), Qt::ISODate);
-    return slot.dateTime;
 }
 
 void CsvParser::reportError(int type, int line, int column, const QString &message)
