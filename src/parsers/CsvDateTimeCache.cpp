@@ -6,8 +6,9 @@
 
 namespace {
 
-constexpr int kFirstDateBits = 10;
-constexpr int kMaximumDateBits = 16;
+constexpr int kDaysPerYear = 12 * 31;
+constexpr int kWindowYears = 64;
+constexpr int kWindow = kWindowYears * kDaysPerYear;
 constexpr int kMaximumTextSlots = 1 << 15;
 
 bool isDigit(QChar c)
@@ -15,76 +16,71 @@ bool isDigit(QChar c)
     return c.unicode() >= '0' && c.unicode() <= '9';
 }
 
-// The digits of "yyyy-MM-dd" as yyyyMMdd, or -1 for any other text. Distinct
-// texts give distinct keys.
-int plainDateKey(const QChar *p, int size)
+int twoDigits(const QChar *p)
+{
+    return (p[0].unicode() - '0') * 10 + (p[1].unicode() - '0');
+}
+
+// "yyyy-MM-dd" with a month of 1 to 12 and a day of 1 to 31 as a day number
+// that counts 31 days a month: distinct texts give distinct numbers, and the
+// dates of a few decades lie close together. -1 for any other text.
+int plainDateNumber(const QChar *p, int size)
 {
     if (size != 10 || p[4].unicode() != '-' || p[7].unicode() != '-')
         return -1;
-    int key = 0;
     for (int i : { 0, 1, 2, 3, 5, 6, 8, 9 }) {
         if (!isDigit(p[i]))
             return -1;
-        key = key * 10 + (p[i].unicode() - '0');
     }
-    return key;
+    const int year = twoDigits(p) * 100 + twoDigits(p + 2);
+    const int month = twoDigits(p + 5);
+    const int day = twoDigits(p + 8);
+    if (month < 1 || month > 12 || day < 1 || day > 31)
+        return -1;
+    return year * kDaysPerYear + (month - 1) * 31 + day - 1;
 }
 
 } // namespace
 
 QDateTime CsvDateTimeCache::fromIsoText(const QChar *text, int size)
 {
-    const int key = plainDateKey(text, size);
-    if (key >= 0)
-        return plainDate(key, text);
+    const int number = plainDateNumber(text, size);
+    if (number >= 0)
+        return plainDate(number, text);
     return otherText(text, size);
 }
 
 void CsvDateTimeCache::clear()
 {
     m_dates.reset();
-    m_dateBits = 0;
-    m_dateCount = 0;
+    m_known.clear();
+    m_firstDate = 0;
     m_slots.reset();
     m_slotCount = 0;
     m_misses = 0;
     m_clock = 0;
 }
 
-// Open addressing, at most half full: the entry holding the key, or the
-// free one where it belongs.
-CsvDateTimeCache::DateEntry *CsvDateTimeCache::dateEntry(int key) const
+// A window of years around the first date seen, one entry a day; dates
+// outside it share the slots of the other texts.
+QDateTime CsvDateTimeCache::plainDate(int number, const QChar *text)
 {
-    const quint32 mask = (1u << m_dateBits) - 1;
-    quint32 index = (quint32(key) * 0x9e3779b1u) >> (32 - m_dateBits);
-    while (m_dates[index].key >= 0 && m_dates[index].key != key)
-        index = (index + 1) & mask;
-    return &m_dates[index];
-}
-
-// When the table can't grow any more, further dates are converted each time.
-QDateTime CsvDateTimeCache::plainDate(int key, const QChar *text)
-{
-    const int size = m_dates ? 1 << m_dateBits : 0;
-    if (m_dateCount * 2 >= size && m_dateBits < kMaximumDateBits) {
-        std::unique_ptr<DateEntry[]> old = std::move(m_dates);
-        m_dateBits = m_dateBits == 0 ? kFirstDateBits : m_dateBits + 1;
-        m_dates.reset(new DateEntry[1 << m_dateBits]);
-        for (int i = 0; i < size; ++i) {
-            if (old[i].key >= 0)
-                *dateEntry(old[i].key) = std::move(old[i]);
-        }
+    if (!m_dates) {
+        const int year = number / kDaysPerYear;
+        m_firstDate = std::max(0, year - kWindowYears / 2) * kDaysPerYear;
+        m_dates.reset(new QDateTime[kWindow]);
+        m_known.assign((kWindow + 63) / 64, 0);
     }
-    DateEntry *entry = dateEntry(key);
-    if (entry->key == key)
-        return entry->dateTime;
-    const QDateTime dateTime = QDateTime::fromString(QString(text, 10), Qt::ISODate);
-    if (m_dateCount * 2 < (1 << m_dateBits)) {
-        entry->key = key;
-        entry->dateTime = dateTime;
-        ++m_dateCount;
+    const int index = number - m_firstDate;
+    if (index < 0 || index >= kWindow)
+        return otherText(text, 10);
+    quint64 &known = m_known[index / 64];
+    const quint64 bit = quint64(1) << (index % 64);
+    if (!(known & bit)) {
+        m_dates[index] = QDateTime::fromString(QString(text, 10), Qt::ISODate);
+        known |= bit;
     }
-    return dateTime;
+    return m_dates[index];
 }
 
 QDateTime CsvDateTimeCache::otherText(const QChar *text, int size)

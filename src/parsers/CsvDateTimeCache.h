@@ -4,6 +4,7 @@
 #include <QDateTime>
 
 #include <memory>
+#include <vector>
 
 // Remembers what QDateTime::fromString(text, Qt::ISODate) made of the texts
 // of one parse. Turning a local date-time into an instant costs a time zone
@@ -16,15 +17,6 @@ public:
     void clear();
 
 private:
-    // "yyyy-MM-dd" texts, the common shape, keyed by their digits: sixteen
-    // bytes an entry, so that the dates of a long column stay in the
-    // processor's cache while the records around them stream through it.
-    struct DateEntry
-    {
-        int key = -1;
-        QDateTime dateTime;
-    };
-
     // Anything else up to 24 characters: a two-way cache keyed by the text,
     // a cache line a slot. Small at first; many distinct texts make it grow.
     struct alignas(64) TextSlot
@@ -36,13 +28,15 @@ private:
         QDateTime dateTime;
     };
 
-    DateEntry *dateEntry(int key) const;
-    QDateTime plainDate(int key, const QChar *text);
+    QDateTime plainDate(int number, const QChar *text);
     QDateTime otherText(const QChar *text, int size);
 
-    std::unique_ptr<DateEntry[]> m_dates;
-    int m_dateBits = 0;
-    int m_dateCount = 0;
+    // "yyyy-MM-dd", the common shape, by day: eight bytes and a bit a day,
+    // so that the dates of a long column stay in the processor's cache while
+    // the records around them stream through it.
+    std::unique_ptr<QDateTime[]> m_dates;
+    std::vector<quint64> m_known;
+    int m_firstDate = 0;
 
     std::unique_ptr<TextSlot[]> m_slots;
     int m_slotCount = 0;

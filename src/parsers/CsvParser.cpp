@@ -476,6 +476,8 @@ bool CsvParser::readRecord()
 void CsvParser::readRecordFields(FieldValues &fields, bool asArray)
 {
     m_recordError = false;
+    if (readRecordInBuffer(fields))
+        return;
     bool ok = readField(fields);
     while (ok) {
         int line;
@@ -498,6 +500,66 @@ void CsvParser::readRecordFields(FieldValues &fields, bool asArray)
                         .arg(length));
         m_recordError = true;
     }
+}
+
+// The common record in one pass: whole in the buffer, as many fields as
+// headers, each one plain without a qualifier or quoted and closed cleanly.
+// It leaves the state the field readers would leave: its line end read and
+// put back. Anything else returns false with nothing consumed, and the field
+// readers take the record and report what is wrong with it.
+bool CsvParser::readRecordInBuffer(FieldValues &fields)
+{
+    const char16_t delimiter = m_delimiter.unicode();
+    const char16_t qualifier = m_textQualifier.unicode();
+    auto isLineEnd = [](char16_t c) { return c == kLineFeed || c == kCarriageReturn; };
+    if (m_pushBackSize != 0 || m_headers.isEmpty() || delimiter == qualifier || isLineEnd(delimiter)
+        || isLineEnd(qualifier))
+        return false;
+
+    const QChar *p = m_pos;
+    int line = m_line;
+    int column = m_column;
+    for (;;) {
+        if (p == m_end)
+            break;
+        if (p->unicode() == qualifier) {
+            QString text;
+            ++column;
+            p = scanQuotedField(p + 1, m_end, text, line, column);
+            if (!p)
+                break;
+            fields.append(QVariant(text));
+        } else {
+            const QChar *begin = p;
+            while (p != m_end && p->unicode() != delimiter && p->unicode() != qualifier && !isLineEnd(p->unicode()))
+                ++p;
+            if (p == m_end || p->unicode() == qualifier)
+                break;
+            const int size = int(p - begin);
+            column += size;
+            fields.append(plainValue(begin, size, size == 0));
+        }
+        const char16_t terminator = p->unicode();
+        if (terminator == delimiter) {
+            ++p;
+            ++column;
+            continue;
+        }
+        if (fields.size() != m_headers.size())
+            break;
+        m_pos = p + 1;
+        pushBack(terminator, line, column);
+        if (terminator == kLineFeed) {
+            m_line = line + 1;
+            m_column = 1;
+        } else {
+            m_line = line;
+            m_column = column + 1;
+        }
+        return true;
+    }
+    fields.clear();
+    return false;
 }
 
 // The size a map would have after inserting this many fields: fields past
@@ -640,21 +702,21 @@ bool CsvParser::readPlainField(QVariant &value)
     return true;
 }
 
-// A quoted field that ends well inside the buffer is measured first and
-// copied once, doubled qualifiers and all; anything else takes the loop.
-bool CsvParser::readQuotedFieldInBuffer(QString &text)
+// Reads a quoted field from just after its opening qualifier up to the
+// character after its closing one, which must be a delimiter or a line end
+// before `end`; counts lines and columns on the way and copies the text once,
+// doubled qualifiers and all. Null when the field doesn't close so.
+const QChar *CsvParser::scanQuotedField(const QChar *begin, const QChar *end, QString &text, int &line,
+                                        int &column) const
 {
     const char16_t delimiter = m_delimiter.unicode();
     const char16_t qualifier = m_textQualifier.unicode();
-    if (m_pushBackSize != 0)
-        return false;
-    const QChar *begin = m_pos;
     const QChar *q = begin;
     int doubled = 0;
-    int lineNumber = m_line;
-    int columnNumber = m_column;
+    int lineNumber = line;
+    int columnNumber = column;
     for (;;) {
-        while (q != m_end && q->unicode() != qualifier) {
+        while (q != end && q->unicode() != qualifier) {
             if (q->unicode() == kLineFeed) {
                 ++lineNumber;
                 columnNumber = 1;
@@ -663,8 +725,8 @@ bool CsvParser::readQuotedFieldInBuffer(QString &text)
             }
             ++q;
         }
-        if (q == m_end || q + 1 == m_end)
-            return false;
+        if (q == end || q + 1 == end)
+            return nullptr;
         const char16_t next = q[1].unicode();
         if (next == qualifier) {
             ++doubled;
@@ -673,7 +735,7 @@ bool CsvParser::readQuotedFieldInBuffer(QString &text)
             continue;
         }
         if (next != delimiter && next != kLineFeed && next != kCarriageReturn)
-            return false;
+            return nullptr;
         break;
     }
 
@@ -689,11 +751,27 @@ bool CsvParser::readQuotedFieldInBuffer(QString &text)
                 ++p;
         }
     }
+    line = lineNumber;
+    column = columnNumber + 1;
+    return q + 1;
+}
+
+// A quoted field that ends well inside the buffer is measured first and
+// copied once; anything else takes the loop.
+bool CsvParser::readQuotedFieldInBuffer(QString &text)
+{
+    if (m_pushBackSize != 0)
+        return false;
+    int lineNumber = m_line;
+    int columnNumber = m_column;
+    const QChar *next = scanQuotedField(m_pos, m_end, text, lineNumber, columnNumber);
+    if (!next)
+        return false;
     // The closing qualifier is read, and the character after it is read and
     // put back, as the loop would.
-    m_pos = q + 1;
+    m_pos = next;
     m_line = lineNumber;
-    m_column = columnNumber + 1;
+    m_column = columnNumber;
     int line;
     int column;
     const int ch = readChar(line, column);

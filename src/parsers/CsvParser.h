@@ -98,6 +98,7 @@ private:
     void prepareRecordTemplate();
     bool readRecord();
     void readRecordFields(FieldValues &fields, bool asArray);
+    bool readRecordInBuffer(FieldValues &fields);
     int mapLength(int fieldCount) const;
     static QVariantList toList(FieldValues &fields);
     QVariantMap toMap(FieldValues &fields) const;
@@ -105,6 +106,8 @@ private:
     bool readPlainField(QVariant &value);
     bool readQuotedField(QString &text);
     bool readQuotedFieldInBuffer(QString &text);
+    const QChar *scanQuotedField(const QChar *begin, const QChar *end, QString &text, int &line,
+                                 int &column) const;
     bool readLineEnd();
     QVariant plainValue(const QChar *begin, int size, bool isNull) const;
     void reportError(int type, int line, int column, const QString &message);
