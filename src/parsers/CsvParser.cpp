@@ -9,6 +9,10 @@
 
 #include <charconv>
 
+#ifdef __SSE2__
+#include <emmintrin.h>
+#endif
+
 namespace {
 
 // Out of band, so that U+FFFF in the data stays an ordinary character.
@@ -16,6 +20,32 @@ constexpr int kEnd = -1;
 constexpr int kLineFeed = '\n';
 constexpr int kCarriageReturn = '\r';
 constexpr qint64 kChunkSize = 1 << 20;
+
+// The first of [p, end) that is one of the characters, or end; eight at a
+// time where the processor allows.
+template<typename... Chars>
+const QChar *findFirstOf(const QChar *p, const QChar *end, Chars... chars)
+{
+#ifdef __SSE2__
+    while (end - p >= 8) {
+        const __m128i block = _mm_loadu_si128(reinterpret_cast<const __m128i *>(p));
+        __m128i hits = _mm_setzero_si128();
+        for (const char16_t c : { char16_t(chars)... })
+            hits = _mm_or_si128(hits, _mm_cmpeq_epi16(block, _mm_set1_epi16(short(c))));
+        const int mask = _mm_movemask_epi8(hits);
+        if (mask != 0)
+            return p + __builtin_ctz(uint(mask)) / 2;
+        p += 8;
+    }
+#endif
+    for (; p != end; ++p) {
+        for (const char16_t c : { char16_t(chars)... }) {
+            if (p->unicode() == c)
+                return p;
+        }
+    }
+    return end;
+}
 
 bool isAsciiDigit(char16_t c)
 {
@@ -29,16 +59,22 @@ bool mayBeIsoDate(const QChar *text, int size)
     return size >= 10 && text[4].isPunct() && text[7].isPunct();
 }
 
-// In the C locale a number can't begin with a letter, save those of "inf"
-// and "nan".
-bool cannotBeCNumber(QChar first)
+// In the C locale a number can't begin with a letter, save "inf" and "nan"
+// in any case, which Qt reads with white space around them: a text of other
+// letters, or longer, is no number.
+bool cannotBeCNumber(const QChar *text, int size)
 {
-    const char16_t c = first.unicode();
-    if (c < 0x80) {
-        const char16_t lower = c | 0x20;
-        return lower >= 'a' && lower <= 'z' && lower != 'i' && lower != 'n';
-    }
-    return first.isLetter();
+    const char16_t c = text[0].unicode();
+    if (c >= 0x80)
+        return text[0].isLetter();
+    const char16_t lower = c | 0x20;
+    if (lower < 'a' || lower > 'z')
+        return false;
+    if (lower != 'i' && lower != 'n')
+        return true;
+    while (size > 0 && text[size - 1].isSpace())
+        --size;
+    return size != 3;
 }
 
 // Plain decimal integers of up to nine digits, which the C locale reads
@@ -531,8 +567,7 @@ bool CsvParser::readRecordInBuffer(FieldValues &fields)
             fields.append(QVariant(text));
         } else {
             const QChar *begin = p;
-            while (p != m_end && p->unicode() != delimiter && p->unicode() != qualifier && !isLineEnd(p->unicode()))
-                ++p;
+            p = plainRunEnd(p);
             if (p == m_end || p->unicode() == qualifier)
                 break;
             const int size = int(p - begin);
@@ -634,20 +669,22 @@ bool CsvParser::readField(FieldValues &fields)
     return true;
 }
 
+// Where a run of plain characters from p ends in the buffer: at a delimiter,
+// a qualifier, a line end or the buffer's end.
+inline const QChar *CsvParser::plainRunEnd(const QChar *p) const
+{
+    return findFirstOf(p, m_end, m_delimiter.unicode(), m_textQualifier.unicode(), char16_t(kLineFeed),
+                       char16_t(kCarriageReturn));
+}
+
 bool CsvParser::readPlainField(QVariant &value)
 {
     const char16_t delimiter = m_delimiter.unicode();
     const char16_t qualifier = m_textQualifier.unicode();
-    auto isSpecial = [=](char16_t c) {
-        return c == delimiter || c == qualifier || c == kLineFeed || c == kCarriageReturn;
-    };
-
     // Most fields lie whole in the buffer and end at a delimiter or line
     // end: they are typed straight from the buffer.
     if (m_pushBackSize == 0) {
-        const QChar *p = m_pos;
-        while (p != m_end && !isSpecial(p->unicode()))
-            ++p;
+        const QChar *p = plainRunEnd(m_pos);
         if (p != m_end && p->unicode() != qualifier) {
             const QChar *begin = m_pos;
             const int size = int(p - begin);
@@ -666,8 +703,7 @@ bool CsvParser::readPlainField(QVariant &value)
     for (;;) {
         if (m_pushBackSize == 0) {
             const QChar *p = m_pos;
-            while (p != m_end && !isSpecial(p->unicode()))
-                ++p;
+            p = plainRunEnd(p);
             if (p != m_pos) {
                 const int run = int(p - m_pos);
                 text.append(m_pos, run);
@@ -716,13 +752,14 @@ const QChar *CsvParser::scanQuotedField(const QChar *begin, const QChar *end, QS
     int lineNumber = line;
     int columnNumber = column;
     for (;;) {
-        while (q != end && q->unicode() != qualifier) {
-            if (q->unicode() == kLineFeed) {
-                ++lineNumber;
-                columnNumber = 1;
-            } else {
-                ++columnNumber;
-            }
+        for (;;) {
+            const QChar *stop = findFirstOf(q, end, qualifier, char16_t(kLineFeed));
+            columnNumber += int(stop - q);
+            q = stop;
+            if (q == end || q->unicode() == qualifier)
+                break;
+            ++lineNumber;
+            columnNumber = 1;
             ++q;
         }
         if (q == end || q + 1 == end)
@@ -898,7 +935,7 @@ QVariant CsvParser::plainValue(const QChar *begin, int size, bool isNull) const
     }
 
     if (m_cLocale) {
-        if (size == 0 || cannotBeCNumber(*begin))
+        if (size == 0 || cannotBeCNumber(begin, size))
             return QVariant(QString(begin, size));
         int integer;
         if (simpleCInt(begin, size, &integer))

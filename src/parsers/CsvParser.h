@@ -103,6 +103,7 @@ private:
     static QVariantList toList(FieldValues &fields);
     QVariantMap toMap(FieldValues &fields) const;
     bool readField(FieldValues &fields);
+    const QChar *plainRunEnd(const QChar *p) const;
     bool readPlainField(QVariant &value);
     bool readQuotedField(QString &text);
     bool readQuotedFieldInBuffer(QString &text);
