@@ -56,7 +56,15 @@ bool isAsciiDigit(char16_t c)
 // anything else can't be a date, and Qt's parser needn't be asked.
 bool mayBeIsoDate(const QChar *text, int size)
 {
-    return size >= 10 && text[4].isPunct() && text[7].isPunct();
+    // Printable ASCII other than letters and digits passes, a superset of
+    // its punctuation, to spare the look-up of the category.
+    auto separator = [](QChar c) {
+        const char16_t u = c.unicode();
+        if (u >= 0x80)
+            return c.isPunct();
+        return u > ' ' && u < 0x7f && !((u | 0x20) >= 'a' && (u | 0x20) <= 'z') && !isAsciiDigit(u);
+    };
+    return size >= 10 && separator(text[4]) && separator(text[7]);
 }
 
 // In the C locale a number can't begin with a letter, save "inf" and "nan"
