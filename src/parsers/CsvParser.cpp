@@ -27,11 +27,12 @@ template<typename... Chars>
 const QChar *findFirstOf(const QChar *p, const QChar *end, Chars... chars)
 {
 #ifdef __SSE2__
+    const __m128i wanted[] = { _mm_set1_epi16(short(chars))... };
     while (end - p >= 8) {
         const __m128i block = _mm_loadu_si128(reinterpret_cast<const __m128i *>(p));
         __m128i hits = _mm_setzero_si128();
-        for (const char16_t c : { char16_t(chars)... })
-            hits = _mm_or_si128(hits, _mm_cmpeq_epi16(block, _mm_set1_epi16(short(c))));
+        for (const __m128i &c : wanted)
+            hits = _mm_or_si128(hits, _mm_cmpeq_epi16(block, c));
         const int mask = _mm_movemask_epi8(hits);
         if (mask != 0)
             return p + __builtin_ctz(uint(mask)) / 2;
