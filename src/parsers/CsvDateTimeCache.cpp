@@ -9,6 +9,7 @@ namespace {
 constexpr int kDaysPerYear = 12 * 31;
 constexpr int kWindowYears = 64;
 constexpr int kWindow = kWindowYears * kDaysPerYear;
+constexpr int kDatesBeforeTable = 256;
 constexpr int kMaximumTextSlots = 1 << 15;
 
 bool isDigit(QChar c)
@@ -55,17 +56,21 @@ void CsvDateTimeCache::clear()
     m_dates.reset();
     m_known.clear();
     m_firstDate = 0;
+    m_plainDates = 0;
     m_slots.reset();
     m_slotCount = 0;
     m_misses = 0;
     m_clock = 0;
 }
 
-// A window of years around the first date seen, one entry a day; dates
-// outside it share the slots of the other texts.
+// A window of years around the date that makes the table, one entry a day;
+// dates outside it share the slots of the other texts, and so do the first
+// dates of a parse, so that a small file doesn't pay for the table.
 QDateTime CsvDateTimeCache::plainDate(int number, const QChar *text)
 {
     if (!m_dates) {
+        if (++m_plainDates <= kDatesBeforeTable)
+            return otherText(text, 10);
         const int year = number / kDaysPerYear;
         m_firstDate = std::max(0, year - kWindowYears / 2) * kDaysPerYear;
         m_dates.reset(new QDateTime[kWindow]);

@@ -37,6 +37,7 @@ private:
     std::unique_ptr<QDateTime[]> m_dates;
     std::vector<quint64> m_known;
     int m_firstDate = 0;
+    int m_plainDates = 0;
 
     std::unique_ptr<TextSlot[]> m_slots;
     int m_slotCount = 0;

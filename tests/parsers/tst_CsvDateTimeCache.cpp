@@ -66,7 +66,7 @@ void tst_CsvDateTimeCache::shapes_data()
 }
 
 // Each shape of text, first seen and then from the cache, against Qt's own
-// reading.
+// reading, before and after the dates of a parse have their own table.
 void tst_CsvDateTimeCache::shapes()
 {
     QFETCH(QString, text);
@@ -74,7 +74,14 @@ void tst_CsvDateTimeCache::shapes()
     const QString expected = reference(text);
     QCOMPARE(cached(cache, text), expected);
     QCOMPARE(cached(cache, text), expected);
+
+    // Again once the parse has seen enough dates for the table of days.
     cache.clear();
+    for (int i = 0; i < 300; ++i) {
+        const QString filler = QDate(2000, 1, 1).addDays(i).toString(Qt::ISODate);
+        QCOMPARE(cached(cache, filler), reference(filler));
+    }
+    QCOMPARE(cached(cache, text), expected);
     QCOMPARE(cached(cache, text), expected);
 }
 
