@@ -11,7 +11,7 @@ QString describe(const QDateTime &dateTime)
 {
     if (!dateTime.isValid())
         return dateTime.isNull() ? QStringLiteral("null") : QStringLiteral("invalid");
-    return dateTime.toString(Qt::ISODateWithMs) + QStringLiteral(" spec %1 ms %2 dst %3")
+    return dateTime.toString(Qt::ISODateWithMs) + QStringLiteral(" time kind %1 ms %2 dst %3")
                                                       .arg(dateTime.timeSpec())
                                                       .arg(dateTime.toMSecsSinceEpoch())
                                                       .arg(dateTime.isDaylightTime());
