@@ -32,8 +32,8 @@ better() {
 report() { # name ours theirs
     echo "$2 $3" | awk -v name="$1" '{
         ours = $2 / $1; theirs = $7 / $6
-        printf "%-34s module %6.1f MB/s (%.2f s: %.2f user %.2f sys)   python %6.1f MB/s (%.2f s: %.2f user %.2f sys)   ratio %.2fx\n",
-               name, ours, $1, $4, $5, theirs, $6, $9, $10, ours / theirs
+        printf "%-34s module %6.1f MB/s (%.2f s: %.2f user %.2f sys)   ", name, ours, $1, $4, $5
+        printf "python %6.1f MB/s (%.2f s: %.2f user %.2f sys)   ratio %.2fx\n", theirs, $6, $9, $10, ours / theirs
     }'
 }
 

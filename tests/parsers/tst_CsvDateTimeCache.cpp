@@ -58,7 +58,8 @@ void tst_CsvDateTimeCache::shapes_data()
         "2021-04-03", "2021-02-29", "2020-02-29", "2021-02-30", "2021-13-01", "2021-00-10", "0000-01-01",
         "0001-01-01", "9999-12-31", "2021-4-03x", "2021/04/03", "2021.04.03", "2021-04-03T10:11:12",
         "2021-04-03T10:11:12Z", "2021-04-03T10:11:12+02:00", "2021-04-03T10:11:12.345+02:00",
-        "2021-04-03 10:11", "2021-04-03T25:00", "2018-11-04", "2018-11-04T00:30", "2019-02-16", "1970-01-01T00:00:00.000000000000Z", "２０２１-04-03",
+        "2021-04-03 10:11", "2021-04-03T25:00", "2018-11-04", "2018-11-04T00:30", "2019-02-16",
+        "1970-01-01T00:00:00.000000000000Z", "２０２１-04-03",
         "2021-04-0３", "-021-04-03", "+021-04-03", " 2021-04-03",
     };
     for (const char *text : texts)
@@ -97,7 +98,8 @@ void tst_CsvDateTimeCache::manyDates()
     for (int i = 0; i < days; i += 1)
         texts.append(first.addDays(i).toString(Qt::ISODate));
     for (int i = 0; i < 3000; ++i)
-        texts.append(first.addDays(i * 7).toString(Qt::ISODate) + QStringLiteral("T%1:30").arg(i % 24, 2, 10, QLatin1Char('0')));
+        texts.append(first.addDays(i * 7).toString(Qt::ISODate)
+                     + QStringLiteral("T%1:30").arg(i % 24, 2, 10, QLatin1Char('0')));
     QStringList expected;
     for (const QString &text : qAsConst(texts))
         expected.append(reference(text));
