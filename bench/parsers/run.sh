@@ -2,16 +2,16 @@
 # Parses a generated CSV file (200 MB) and XML file (50 MB) with the module's
 # code and, in the same run, with python3's csv.DictReader and xmltodict, and
 # prints MB/s and the ratio. Times are processor seconds (user and system),
-# best of RUNS rounds that take turns.
+# the best of RUNS rounds that take turns, each run twice in a row.
 # "records built, no parsing" times making the typed result's maps and texts
 # alone (see bench_parsers.cpp): a bound on the first ratio.
-# Environment: LOOMKIT_BUILD_DIR (build), CSV_MB (200), XML_MB (50), RUNS (3).
+# Environment: LOOMKIT_BUILD_DIR (build), CSV_MB (200), XML_MB (50), RUNS (2).
 set -e
 cd "$(dirname "$0")/../.."
 BUILD=${LOOMKIT_BUILD_DIR:-build}
 CSV_MB=${CSV_MB:-200}
 XML_MB=${XML_MB:-50}
-RUNS=${RUNS:-3}
+RUNS=${RUNS:-2}
 DATA="$BUILD/bench-data"
 
 python3 -c "import xmltodict" 2>/dev/null || ./scripts/setup-debian.sh
@@ -29,6 +29,13 @@ better() {
     printf '%s\n%s\n' "$1" "$2" | awk 'NF == 5' | sort -n | head -n 1
 }
 
+# pair <command...>: runs the command twice in a row and prints the better run.
+pair() {
+    first=$("$@")
+    second=$("$@")
+    better "$first" "$second"
+}
+
 report() { # name ours theirs
     echo "$2 $3" | awk -v name="$1" '{
         ours = $2 / $1; theirs = $7 / $6
@@ -39,18 +46,21 @@ report() { # name ours theirs
 
 BENCH="$BUILD/bench/bench_parsers"
 PYTHON_SIDE=bench/parsers/python_side.py
-# Rounds of every run in turn, the best of each kept: the kernel's cost of
-# handing out fresh memory changes from minute to minute on a shared virtual
-# machine, so both sides meet it alike rather than one after the other.
+# Rounds of every run in turn, each run twice in a row, the best kept. Most
+# of the system time is the kernel handing out fresh pages for the results,
+# and on this shared virtual machine that costs more when the run before was
+# small (pages just freed by a run of the same size come back cheaper than
+# pages the host has taken back meanwhile); so every run is timed after one
+# of its own kind, and both sides meet the machine in the same spells.
 csv_auto="" csv_text="" csv_build="" csv_python="" xml_ours="" xml_python=""
 round=0
 while [ $round -lt "$RUNS" ]; do
-    line=$("$BENCH" csv "$CSV"); csv_auto=$(better "$csv_auto" "$line")
-    line=$(python3 "$PYTHON_SIDE" csv "$CSV"); csv_python=$(better "$csv_python" "$line")
-    line=$("$BENCH" csv-text "$CSV"); csv_text=$(better "$csv_text" "$line")
-    line=$("$BENCH" csv-build "$CSV"); csv_build=$(better "$csv_build" "$line")
-    line=$("$BENCH" xml "$XML"); xml_ours=$(better "$xml_ours" "$line")
-    line=$(python3 "$PYTHON_SIDE" xml "$XML"); xml_python=$(better "$xml_python" "$line")
+    line=$(pair "$BENCH" csv "$CSV"); csv_auto=$(better "$csv_auto" "$line")
+    line=$(pair python3 "$PYTHON_SIDE" csv "$CSV"); csv_python=$(better "$csv_python" "$line")
+    line=$(pair "$BENCH" csv-text "$CSV"); csv_text=$(better "$csv_text" "$line")
+    line=$(pair "$BENCH" csv-build "$CSV"); csv_build=$(better "$csv_build" "$line")
+    line=$(pair "$BENCH" xml "$XML"); xml_ours=$(better "$xml_ours" "$line")
+    line=$(pair python3 "$PYTHON_SIDE" xml "$XML"); xml_python=$(better "$xml_python" "$line")
     round=$((round + 1))
 done
 
