@@ -9,6 +9,10 @@
 
 #include <charconv>
 
+#ifdef __SSE2__
+#include <emmintrin.h>
+#endif
+
 namespace {
 
 // Out of band, so that U+FFFF in the data stays an ordinary character.
@@ -16,6 +20,33 @@ constexpr int kEnd = -1;
 constexpr int kLineFeed = '\n';
 constexpr int kCarriageReturn = '\r';
 constexpr qint64 kChunkSize = 1 << 20;
+
+// The first of [p, end) that is one of the characters, or end; eight at a
+// time where the processor allows.
+template<typename... Chars>
+const QChar *findFirstOf(const QChar *p, const QChar *end, Chars... chars)
+{
+#ifdef __SSE2__
+    const __m128i wanted[] = { _mm_set1_epi16(short(chars))... };
+    while (end - p >= 8) {
+        const __m128i block = _mm_loadu_si128(reinterpret_cast<const __m128i *>(p));
+        __m128i hits = _mm_setzero_si128();
+        for (const __m128i &c : wanted)
+            hits = _mm_or_si128(hits, _mm_cmpeq_epi16(block, c));
+        const int mask = _mm_movemask_epi8(hits);
+        if (mask != 0)
+            return p + __builtin_ctz(uint(mask)) / 2;
+        p += 8;
+    }
+#endif
+    for (; p != end; ++p) {
+        for (const char16_t c : { char16_t(chars)... }) {
+            if (p->unicode() == c)
+                return p;
+        }
+    }
+    return end;
+}
 
 bool isAsciiDigit(char16_t c)
 {
@@ -26,19 +57,33 @@ bool isAsciiDigit(char16_t c)
 // anything else can't be a date, and Qt's parser needn't be asked.
 bool mayBeIsoDate(const QChar *text, int size)
 {
-    return size >= 10 && text[4].isPunct() && text[7].isPunct();
+    // Printable ASCII other than letters and digits passes, a superset of
+    // its punctuation, to spare the look-up of the category.
+    auto separator = [](QChar c) {
+        const char16_t u = c.unicode();
+        if (u >= 0x80)
+            return c.isPunct();
+        return u > ' ' && u < 0x7f && !((u | 0x20) >= 'a' && (u | 0x20) <= 'z') && !isAsciiDigit(u);
+    };
+    return size >= 10 && separator(text[4]) && separator(text[7]);
 }
 
-// In the C locale a number can't begin with a letter, save those of "inf"
-// and "nan".
-bool cannotBeCNumber(QChar first)
+// In the C locale a number can't begin with a letter, save "inf" and "nan"
+// in any case, which Qt reads with white space around them: a text of other
+// letters, or longer, is no number.
+bool cannotBeCNumber(const QChar *text, int size)
 {
-    const char16_t c = first.unicode();
-    if (c < 0x80) {
-        const char16_t lower = c | 0x20;
-        return lower >= 'a' && lower <= 'z' && lower != 'i' && lower != 'n';
-    }
-    return first.isLetter();
+    const char16_t c = text[0].unicode();
+    if (c >= 0x80)
+        return text[0].isLetter();
+    const char16_t lower = c | 0x20;
+    if (lower < 'a' || lower > 'z')
+        return false;
+    if (lower != 'i' && lower != 'n')
+        return true;
+    while (size > 0 && text[size - 1].isSpace())
+        --size;
+    return size != 3;
 }
 
 // Plain decimal integers of up to nine digits, which the C locale reads
@@ -291,9 +336,7 @@ bool CsvParser::parse()
         m_headers.clear();
     m_line = 1;
     m_column = 1;
-    m_dateTimeSlots.reset();
-    m_dateTimeSlotCount = 0;
-    m_dateTimeMisses = 0;
+    m_dateTimes.clear();
 
     if (!m_hasFixedFields && !readHeaderRow()) {
         close();
@@ -478,6 +521,8 @@ bool CsvParser::readRecord()
 void CsvParser::readRecordFields(FieldValues &fields, bool asArray)
 {
     m_recordError = false;
+    if (readRecordInBuffer(fields))
+        return;
     bool ok = readField(fields);
     while (ok) {
         int line;
@@ -500,6 +545,65 @@ void CsvParser::readRecordFields(FieldValues &fields, bool asArray)
                         .arg(length));
         m_recordError = true;
     }
+}
+
+// The common record in one pass: whole in the buffer, as many fields as
+// headers, each one plain without a qualifier or quoted and closed cleanly.
+// It leaves the state the field readers would leave: its line end read and
+// put back. Anything else returns false with nothing consumed, and the field
+// readers take the record and report what is wrong with it.
+bool CsvParser::readRecordInBuffer(FieldValues &fields)
+{
+    const char16_t delimiter = m_delimiter.unicode();
+    const char16_t qualifier = m_textQualifier.unicode();
+    auto isLineEnd = [](char16_t c) { return c == kLineFeed || c == kCarriageReturn; };
+    if (m_pushBackSize != 0 || m_headers.isEmpty() || delimiter == qualifier || isLineEnd(delimiter)
+        || isLineEnd(qualifier))
+        return false;
+
+    const QChar *p = m_pos;
+    int line = m_line;
+    int column = m_column;
+    for (;;) {
+        if (p == m_end)
+            break;
+        if (p->unicode() == qualifier) {
+            QString text;
+            ++column;
+            p = scanQuotedField(p + 1, m_end, text, line, column);
+            if (!p)
+                break;
+            fields.append(QVariant(text));
+        } else {
+            const QChar *begin = p;
+            p = plainRunEnd(p);
+            if (p == m_end || p->unicode() == qualifier)
+                break;
+            const int size = int(p - begin);
+            column += size;
+            fields.append(plainValue(begin, size, size == 0));
+        }
+        const char16_t terminator = p->unicode();
+        if (terminator == delimiter) {
+            ++p;
+            ++column;
+            continue;
+        }
+        if (fields.size() != m_headers.size())
+            break;
+        m_pos = p + 1;
+        pushBack(terminator, line, column);
+        if (terminator == kLineFeed) {
+            m_line = line + 1;
+            m_column = 1;
+        } else {
+            m_line = line;
+            m_column = column + 1;
+        }
+        return true;
+    }
+    fields.clear();
+    return false;
 }
 
 // The size a map would have after inserting this many fields: fields past
@@ -574,20 +678,22 @@ bool CsvParser::readField(FieldValues &fields)
     return true;
 }
 
+// Where a run of plain characters from p ends in the buffer: at a delimiter,
+// a qualifier, a line end or the buffer's end.
+inline const QChar *CsvParser::plainRunEnd(const QChar *p) const
+{
+    return findFirstOf(p, m_end, m_delimiter.unicode(), m_textQualifier.unicode(), char16_t(kLineFeed),
+                       char16_t(kCarriageReturn));
+}
+
 bool CsvParser::readPlainField(QVariant &value)
 {
     const char16_t delimiter = m_delimiter.unicode();
     const char16_t qualifier = m_textQualifier.unicode();
-    auto isSpecial = [=](char16_t c) {
-        return c == delimiter || c == qualifier || c == kLineFeed || c == kCarriageReturn;
-    };
-
     // Most fields lie whole in the buffer and end at a delimiter or line
     // end: they are typed straight from the buffer.
     if (m_pushBackSize == 0) {
-        const QChar *p = m_pos;
-        while (p != m_end && !isSpecial(p->unicode()))
-            ++p;
+        const QChar *p = plainRunEnd(m_pos);
         if (p != m_end && p->unicode() != qualifier) {
             const QChar *begin = m_pos;
             const int size = int(p - begin);
@@ -606,8 +712,7 @@ bool CsvParser::readPlainField(QVariant &value)
     for (;;) {
         if (m_pushBackSize == 0) {
             const QChar *p = m_pos;
-            while (p != m_end && !isSpecial(p->unicode()))
-                ++p;
+            p = plainRunEnd(p);
             if (p != m_pos) {
                 const int run = int(p - m_pos);
                 text.append(m_pos, run);
@@ -642,31 +747,32 @@ bool CsvParser::readPlainField(QVariant &value)
     return true;
 }
 
-// A quoted field that ends well inside the buffer is measured first and
-// copied once, doubled qualifiers and all; anything else takes the loop.
-bool CsvParser::readQuotedFieldInBuffer(QString &text)
+// Reads a quoted field from just after its opening qualifier up to the
+// character after its closing one, which must be a delimiter or a line end
+// before `end`; counts lines and columns on the way and copies the text once,
+// doubled qualifiers and all. Null when the field doesn't close so.
+const QChar *CsvParser::scanQuotedField(const QChar *begin, const QChar *end, QString &text, int &line,
+                                        int &column) const
 {
     const char16_t delimiter = m_delimiter.unicode();
     const char16_t qualifier = m_textQualifier.unicode();
-    if (m_pushBackSize != 0)
-        return false;
-    const QChar *begin = m_pos;
     const QChar *q = begin;
     int doubled = 0;
-    int lineNumber = m_line;
-    int columnNumber = m_column;
+    int lineNumber = line;
+    int columnNumber = column;
     for (;;) {
-        while (q != m_end && q->unicode() != qualifier) {
-            if (q->unicode() == kLineFeed) {
-                ++lineNumber;
-                columnNumber = 1;
-            } else {
-                ++columnNumber;
-            }
+        for (;;) {
+            const QChar *stop = findFirstOf(q, end, qualifier, char16_t(kLineFeed));
+            columnNumber += int(stop - q);
+            q = stop;
+            if (q == end || q->unicode() == qualifier)
+                break;
+            ++lineNumber;
+            columnNumber = 1;
             ++q;
         }
-        if (q == m_end || q + 1 == m_end)
-            return false;
+        if (q == end || q + 1 == end)
+            return nullptr;
         const char16_t next = q[1].unicode();
         if (next == qualifier) {
             ++doubled;
@@ -675,7 +781,7 @@ bool CsvParser::readQuotedFieldInBuffer(QString &text)
             continue;
         }
         if (next != delimiter && next != kLineFeed && next != kCarriageReturn)
-            return false;
+            return nullptr;
         break;
     }
 
@@ -691,11 +797,27 @@ bool CsvParser::readQuotedFieldInBuffer(QString &text)
                 ++p;
         }
     }
+    line = lineNumber;
+    column = columnNumber + 1;
+    return q + 1;
+}
+
+// A quoted field that ends well inside the buffer is measured first and
+// copied once; anything else takes the loop.
+bool CsvParser::readQuotedFieldInBuffer(QString &text)
+{
+    if (m_pushBackSize != 0)
+        return false;
+    int lineNumber = m_line;
+    int columnNumber = m_column;
+    const QChar *next = scanQuotedField(m_pos, m_end, text, lineNumber, columnNumber);
+    if (!next)
+        return false;
     // The closing qualifier is read, and the character after it is read and
     // put back, as the loop would.
-    m_pos = q + 1;
+    m_pos = next;
     m_line = lineNumber;
-    m_column = columnNumber + 1;
+    m_column = columnNumber;
     int line;
     int column;
     const int ch = readChar(line, column);
@@ -811,7 +933,7 @@ QVariant CsvParser::plainValue(const QChar *begin, int size, bool isNull) const
 
     if (m_dateTimeFormat.isEmpty()) {
         if (mayBeIsoDate(begin, size)) {
-            const QDateTime dateTime = isoDateTime(begin, size);
+            const QDateTime dateTime = m_dateTimes.fromIsoText(begin, size);
             if (dateTime.isValid())
                 return QVariant(dateTime);
         }
@@ -822,7 +944,7 @@ QVariant CsvParser::plainValue(const QChar *begin, int size, bool isNull) const
     }
 
     if (m_cLocale) {
-        if (size == 0 || cannotBeCNumber(*begin))
+        if (size == 0 || cannotBeCNumber(begin, size))
             return QVariant(QString(begin, size));
         int integer;
         if (simpleCInt(begin, size, &integer))
@@ -841,41 +963,6 @@ QVariant CsvParser::plainValue(const QChar *begin, int size, bool isNull) const
     if (ok)
         return QVariant(real);
     return QVariant(text);
-}
-
-// Turning a local date-time into an instant costs a time zone lookup in the
-// C library, far more than the rest of a field; columns of dates repeat, so
-// a two-way cache remembers recent texts. Keys live in the slots themselves,
-// so a look-up touches one cache line.
-QDateTime CsvParser::isoDateTime(const QChar *begin, int size) const
-{
-    if (size > DateTimeSlot::kMaximumText)
-        return QDateTime::fromString(QString(begin, size), Qt::ISODate);
-    uint hash = 2166136261u;
-    for (int i = 0; i < size; ++i)
-        hash = (hash ^ begin[i].unicode()) * 16777619u;
-    // Small at first; a column of many distinct dates makes it grow.
-    if (m_dateTimeMisses >= m_dateTimeSlotCount && m_dateTimeSlotCount < kMaximumDateTimeSlots) {
-        m_dateTimeSlotCount = m_dateTimeSlotCount == 0 ? 256 : m_dateTimeSlotCount * 8;
-        m_dateTimeSlots.reset(new DateTimeSlot[m_dateTimeSlotCount]);
-        m_dateTimeMisses = 0;
-    }
-    const uint index = (hash ^ (hash >> 15)) & uint(m_dateTimeSlotCount - 2);
-    DateTimeSlot *pair = m_dateTimeSlots.get() + index;
-    for (int way = 0; way < 2; ++way) {
-        DateTimeSlot &slot = pair[way];
-        if (slot.size == size && std::equal(begin, begin + size, slot.text)) {
-            slot.age = ++m_dateTimeClock;
-            return slot.dateTime;
-        }
-    }
-    ++m_dateTimeMisses;
-    DateTimeSlot &slot = pair[0].age <= pair[1].age ? pair[0] : pair[1];
-    std::copy(begin, begin + size, slot.text);
-    slot.size = size;
-    slot.age = ++m_dateTimeClock;
-    slot.dateTime = QDateTime::fromString(QString(begin, size), Qt::ISODate);
-    return slot.dateTime;
 }
 
 void CsvParser::reportError(int type, int line, int column, const QString &message)

@@ -1,6 +1,7 @@
 #ifndef CSVPARSER_H
 #define CSVPARSER_H
 
+#include "CsvDateTimeCache.h"
 #include "CsvError.h"
 
 #include <QDateTime>
@@ -97,16 +98,19 @@ private:
     void prepareRecordTemplate();
     bool readRecord();
     void readRecordFields(FieldValues &fields, bool asArray);
+    bool readRecordInBuffer(FieldValues &fields);
     int mapLength(int fieldCount) const;
     static QVariantList toList(FieldValues &fields);
     QVariantMap toMap(FieldValues &fields) const;
     bool readField(FieldValues &fields);
+    const QChar *plainRunEnd(const QChar *p) const;
     bool readPlainField(QVariant &value);
     bool readQuotedField(QString &text);
     bool readQuotedFieldInBuffer(QString &text);
+    const QChar *scanQuotedField(const QChar *begin, const QChar *end, QString &text, int &line,
+                                 int &column) const;
     bool readLineEnd();
     QVariant plainValue(const QChar *begin, int size, bool isNull) const;
-    QDateTime isoDateTime(const QChar *begin, int size) const;
     void reportError(int type, int line, int column, const QString &message);
 
     QPointer<QIODevice> m_device;
@@ -145,20 +149,7 @@ private:
     bool m_hasFixedFields = false;
     bool m_autoType = true;
     QString m_dateTimeFormat;
-    // One cache line each.
-    struct alignas(64) DateTimeSlot
-    {
-        static constexpr int kMaximumText = 24;
-        QChar text[kMaximumText];
-        int size = -1;
-        quint32 age = 0;
-        QDateTime dateTime;
-    };
-    mutable quint32 m_dateTimeClock = 0;
-    static constexpr int kMaximumDateTimeSlots = 1 << 15;
-    mutable std::unique_ptr<DateTimeSlot[]> m_dateTimeSlots;
-    mutable int m_dateTimeSlotCount = 0;
-    mutable int m_dateTimeMisses = 0;
+    mutable CsvDateTimeCache m_dateTimes;
     QLocale m_locale = QLocale::c();
     bool m_cLocale = true;
 };

@@ -130,6 +130,8 @@ private slots:
     void signalOrder();
     void typing_data();
     void typing();
+    void typingWords_data();
+    void typingWords();
     void encodings_data();
     void encodings();
     void csvSpectrum_data();
@@ -397,6 +399,34 @@ void tst_CsvParser::typing()
     const Result twice = parseBytes("h\n" + text.toUtf8() + "\n" + text.toUtf8(), options);
     QCOMPARE(twice.records.size(), 2);
     QCOMPARE(describe(twice.records.at(1)), describe(twice.records.at(0)));
+}
+
+void tst_CsvParser::typingWords_data()
+{
+    QTest::addColumn<QString>("text");
+    QTest::addColumn<bool>("trim");
+
+    const QStringList samples { "india", "november", "naïve", "nan", "NaN", "NAN", "inf", "Inf", "iNF", "in",
+                                "i", "n", "na", "info", "nanny", "infinity", "inf ", "nan\t", " inf", "in f",
+                                "ina", "x-ray", "Zulu", "İnf", "ınf" };
+    for (const QString &sample : samples) {
+        QTest::addRow("'%s'", qPrintable(sample)) << sample << true;
+        QTest::addRow("'%s' untrimmed", qPrintable(sample)) << sample << false;
+    }
+}
+
+// Words, some of which Qt reads as numbers, in the C locale and with the
+// surrounding white space kept or not.
+void tst_CsvParser::typingWords()
+{
+    QFETCH(QString, text);
+    QFETCH(bool, trim);
+
+    const Result result = parseBytes("h\n" + text.toUtf8(), ::options({ { "trim", trim } }));
+    QVERIFY(result.ok);
+    QCOMPARE(result.records.size(), 1);
+    const QVariant value = result.records.first().toMap().value("h");
+    QCOMPARE(describe(value), describe(referenceType(trim ? text.trimmed() : text, QLocale::c(), QString())));
 }
 
 void tst_CsvParser::encodings_data()
