@@ -7,7 +7,7 @@ import Qt.labs.folderlistmodel 2.15
 Window {
     id: window
     width: 1280
-    height: 1320
+    height: 1560
     visible: true
     color: "#eef1f5"
     title: qsTr("Loomkit gallery")
