@@ -5,7 +5,9 @@
 # the best of RUNS rounds that take turns, each run twice in a row.
 # "records built, no parsing" times making the typed result's maps and texts
 # alone (see bench_parsers.cpp): a bound on the first ratio.
-# Environment: LOOMKIT_BUILD_DIR (build), CSV_MB (200), XML_MB (50), RUNS (2).
+# Environment: LOOMKIT_BUILD_DIR (build), CSV_MB (200), XML_MB (50), RUNS (2),
+# PYTHON (Debian's /usr/bin/python3, the one its python3-xmltodict is for,
+# rather than whatever python3 comes first on the path).
 set -e
 cd "$(dirname "$0")/../.."
 BUILD=${LOOMKIT_BUILD_DIR:-build}
@@ -14,14 +16,16 @@ XML_MB=${XML_MB:-50}
 RUNS=${RUNS:-2}
 DATA="$BUILD/bench-data"
 
-python3 -c "import xmltodict" 2>/dev/null || ./scripts/setup-debian.sh
+PYTHON=${PYTHON:-/usr/bin/python3}
+[ -x "$PYTHON" ] || PYTHON=python3
+"$PYTHON" -c "import xmltodict" 2>/dev/null || ./scripts/setup-debian.sh
 [ -f "$BUILD/CMakeCache.txt" ] || cmake -S . -B "$BUILD" -G Ninja -DCMAKE_BUILD_TYPE=RelWithDebInfo >/dev/null
 cmake --build "$BUILD" --target bench_parsers >/dev/null
 mkdir -p "$DATA"
 CSV="$DATA/parsers-$CSV_MB.csv"
 XML="$DATA/parsers-$XML_MB.xml"
-[ -s "$CSV" ] || python3 bench/parsers/generate.py csv "$CSV" "$CSV_MB"
-[ -s "$XML" ] || python3 bench/parsers/generate.py xml "$XML" "$XML_MB"
+[ -s "$CSV" ] || "$PYTHON" bench/parsers/generate.py csv "$CSV" "$CSV_MB"
+[ -s "$XML" ] || "$PYTHON" bench/parsers/generate.py xml "$XML" "$XML_MB"
 
 # better <line> <line>: of two results "seconds megabytes items user system",
 # the one with the smaller time (an empty or broken one never wins).
@@ -56,11 +60,11 @@ csv_auto="" csv_text="" csv_build="" csv_python="" xml_ours="" xml_python=""
 round=0
 while [ $round -lt "$RUNS" ]; do
     line=$(pair "$BENCH" csv "$CSV"); csv_auto=$(better "$csv_auto" "$line")
-    line=$(pair python3 "$PYTHON_SIDE" csv "$CSV"); csv_python=$(better "$csv_python" "$line")
+    line=$(pair "$PYTHON" "$PYTHON_SIDE" csv "$CSV"); csv_python=$(better "$csv_python" "$line")
     line=$(pair "$BENCH" csv-text "$CSV"); csv_text=$(better "$csv_text" "$line")
     line=$(pair "$BENCH" csv-build "$CSV"); csv_build=$(better "$csv_build" "$line")
     line=$(pair "$BENCH" xml "$XML"); xml_ours=$(better "$xml_ours" "$line")
-    line=$(pair python3 "$PYTHON_SIDE" xml "$XML"); xml_python=$(better "$xml_python" "$line")
+    line=$(pair "$PYTHON" "$PYTHON_SIDE" xml "$XML"); xml_python=$(better "$xml_python" "$line")
     round=$((round + 1))
 done
 
