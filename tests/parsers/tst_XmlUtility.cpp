@@ -1,4 +1,5 @@
 #include "TestSupport.h"
+#include "XmlElementValue.h"
 #include "XmlUtility.h"
 
 #include <QDir>
@@ -33,6 +34,22 @@ QString readText(const QString &path)
     const QByteArray bytes = file.readAll();
     QTextCodec *codec = QTextCodec::codecForUtfText(bytes, QTextCodec::codecForName("UTF-8"));
     return codec->toUnicode(bytes);
+}
+
+// What a walk over the DOM of the text gives.
+QVariantMap viaDom(const QString &xml, const QVariantMap &optionMap)
+{
+    QDomDocument document;
+    if (!document.setContent(xml))
+        return QVariantMap();
+    const XmlUtility::Options options = XmlUtility::Options::fromMap(optionMap);
+    const QDomElement root = document.documentElement();
+    const QVariant value = XmlUtility::toVariant(root, options);
+    if (!options.rootProperty)
+        return value.toMap();
+    QVariantMap result;
+    result.insert(XmlElementValue::Context(options).elementKey(root.tagName()), value);
+    return result;
 }
 
 QString nested(int depth)
@@ -117,6 +134,12 @@ void tst_XmlUtility::conversion_data()
     QTest::newRow("text outside the root") << "<r/>x" << none << "{}";
     QTest::newRow("entity with markup")
         << "<!DOCTYPE r [<!ENTITY e \"<b>in</b>\">]><r>&e;</r>" << none << R"({"#nodes":["b"],"b":"in"})";
+    QTest::newRow("entity inside text")
+        << "<!DOCTYPE r [<!ENTITY e \"mid\">]><r k=\"&e;\">a&e;b</r>" << none << R"({"#text":"amidb","@k":"mid"})";
+    QTest::newRow("empty CDATA") << "<r><![CDATA[]]></r>" << none << R"({"#cdata":"","#nodes":["#cdata"]})";
+    QTest::newRow("carriage return kept") << "<r><a>x\r\ny</a></r>" << none << R"({"#nodes":["a"],"a":"x\r\ny"})";
+    QTest::newRow("around the root") << "<?xml version=\"1.0\"?><!--c--><?pi?><r><a/></r><!--d--><?pj?>" << none
+                                     << R"({"#nodes":["a"],"a":null})";
 }
 
 void tst_XmlUtility::conversion()
@@ -127,6 +150,7 @@ void tst_XmlUtility::conversion()
 
     const QVariantMap result = XmlUtility::toVariantMap(xml, options);
     QCOMPARE(toJson(result), json);
+    QCOMPARE(toJson(result), toJson(viaDom(xml, options)));
 }
 
 void tst_XmlUtility::toVariantOfElement()
@@ -173,13 +197,7 @@ void tst_XmlUtility::corpusMatchesDom()
 {
     QFETCH(QString, path);
     const QString xml = readText(path);
-    QDomDocument document;
-    QVariantMap expected;
-    if (document.setContent(xml)) {
-        const QVariant root = XmlUtility::toVariant(document.documentElement(), XmlUtility::Options());
-        expected = root.toMap();
-    }
-    QCOMPARE(toJson(XmlUtility::toVariantMap(xml)), toJson(expected));
+    QCOMPARE(toJson(XmlUtility::toVariantMap(xml)), toJson(viaDom(xml, QVariantMap())));
 }
 
 void tst_XmlUtility::hostile_data()
