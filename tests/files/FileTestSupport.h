@@ -31,9 +31,11 @@ inline bool makeFifo(const QString &path)
     return ::mkfifo(QFile::encodeName(path).constData(), 0600) == 0;
 }
 
-inline void expectWarning(const char *pattern, QtMsgType type = QtWarningMsg)
+// True, so that it can lead a check: QVERIFY(expectWarning("...") && !call()).
+inline bool expectWarning(const char *pattern, QtMsgType type = QtWarningMsg)
 {
     QTest::ignoreMessage(type, QRegularExpression(QString::fromUtf8(pattern)));
+    return true;
 }
 
 } // namespace FileTestSupport

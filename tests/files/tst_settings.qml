@@ -20,6 +20,7 @@ TestCase {
     }
 
     function test_loadAndSave() {
+        // The module's own type and the singleton's store share the application's settings.
         var first = createTemporaryObject(boundComponent, this)
         compare(Loomkit.settings.value("userName"), "guest")
         first.userName = "ada"
@@ -31,23 +32,5 @@ TestCase {
         compare(second.userName, "ada")
         compare(second.accent, "#80112233")
         compare(second.zoom, 1.5)
-    }
-
-    function test_blankKeepsDeclared() {
-        Loomkit.settings.setValue("userName", "  ")
-        verify(!Loomkit.settings.contains("userName"))
-        compare(createTemporaryObject(boundComponent, this).userName, "guest")
-    }
-
-    function test_typedSurface() {
-        var settings = Loomkit.settings
-        settings.setValue("qml/a", 1, 1)
-        verify(!settings.contains("qml/a"))
-        settings.setValue("qml/a", 2, 1)
-        compare(settings.numberValue("qml/a"), 2)
-        compare(settings.value("qml/missing", 5), 5)
-        verify(settings.boolValue("qml/missing", true))
-        settings.setColorValue("qml/c", Qt.rgba(1, 0, 0, 1))
-        compare(settings.value("qml/c"), "#ff0000")
     }
 }
