@@ -98,10 +98,9 @@ QString tst_QExifImageHeader::taggedFile(const QString &name, const QString &byt
 {
     const QString path = m_dir.filePath(name);
     const QStringList arguments{"-ExifByteOrder=" + byteOrder, "-Make=Acme", "-Model=Cam 1", "-Artist=Ann",
-                                "-Orientation#=6", "-XResolution=300", "-DateTimeOriginal=2024:05:06 07:08:09",
-                                "-ExposureTime=0.01", "-ExposureCompensation=-0.5", "-InteropIndex=R98",
-                                "-GPSLatitude=33.5", "-GPSLatitudeRef=S", "-ThumbnailImage<=" + m_thumbnail,
-                                "-XMP-dc:Title=Loom"};
+                                "-Orientation#=6", "-XResolution=300", "-ExposureTime=0.01", "-ExposureCompensation=-0.5",
+                                "-InteropIndex=R98", "-GPSLatitude=33.5", "-GPSLatitudeRef=S",
+                                "-ThumbnailImage<=" + m_thumbnail, "-XMP-dc:Title=Loom"};
     return makeJpeg(path) && exiftoolWrite(path, arguments) ? path : QString();
 }
 
@@ -123,23 +122,18 @@ void tst_QExifImageHeader::exiftoolRoundTrip()
     segments(readFile(path), &sos);
     const QByteArray scan = readFile(path).mid(sos);
 
+    // What the camera files don't show: inline text, the pointers, signed and reversed values.
     QExifImageHeader header;
     QVERIFY(header.loadFromJpeg(path));
-    QCOMPARE(header.byteOrder(), le ? QDataStream::LittleEndian : QDataStream::BigEndian);
-    QCOMPARE(header.imageValue(271).toString(), QStringLiteral("Acme"));
-    QCOMPARE(header.imageValue(315).toString(), QStringLiteral("Ann")); // inline ASCII
-    QCOMPARE(header.imageValue(274).toShort(), quint16(6));
+    QCOMPARE(header.imageValue(315).toString(), QStringLiteral("Ann"));
     QCOMPARE(header.imageValue(282).toRational(), QExifURational(300, 1));
     // The IFD pointers are structure, not tags.
     QVERIFY(!header.containsImageTag(34665) && !header.containsImageTag(34853) && !header.containsExtendedTag(40965));
-    QCOMPARE(header.extendedValue(36867).toString(), QStringLiteral("2024:05:06 07:08:09"));
     QCOMPARE(ratio(header.extendedValue(37380).toSignedRational()), -0.5);
     // Short UNDEFINED values lie in the entry as a word: big-endian files give them back reversed.
     QCOMPARE(header.extendedValue(36864).toByteArray(), le ? QByteArray("0232") : QByteArray("2320"));
     QCOMPARE(header.gpsValue(0).toByteVector(), (QVector<quint8>{2, 3, 0, 0}));
     const QVector<QExifURational> latitude = header.gpsValue(2).toRationalVector();
-    QCOMPARE(latitude.size(), 3);
-    QCOMPARE(ratio(latitude[0]) + ratio(latitude[1]) / 60 + ratio(latitude[2]) / 3600, 33.5);
     QCOMPARE(header.thumbnailData(), readFile(m_thumbnail));
 
     header.setImageValue(271, QExifValue(QStringLiteral("Loomkit")));
@@ -199,10 +193,6 @@ void tst_QExifImageHeader::onlyTheFirstApp1Counts()
     QVERIFY(!exiftoolRead(path).value("IFD0:Make").toString().isEmpty());
     QVERIFY(!header.loadFromJpeg(path));
     QVERIFY(header.imageTags().isEmpty());
-
-    // The corpus files whose APP1 holds XMP only.
-    for (const QString &name : {QStringLiteral("image01551.jpg"), QStringLiteral("image02206.jpg")})
-        QVERIFY(!header.loadFromJpeg(TestSupport::dataPath(QStringLiteral("exif/broken/") + name)));
 }
 
 void tst_QExifImageHeader::blockLayout()
