@@ -93,7 +93,6 @@ void tst_ImageAttributes::roundTrip_data()
     QTest::newRow("null") << QVariant::fromValue(nullptr) << 51 << QVariant::fromValue<QObject *>(nullptr);
     // Other values are stored as their text and come back as its bytes.
     QTest::newRow("int") << QVariant(5) << 2 << QVariant(QByteArray("5"));
-    QTest::newRow("bool") << QVariant(true) << 1 << QVariant(QByteArray("true"));
 }
 
 void tst_ImageAttributes::roundTrip()

@@ -455,40 +455,34 @@ void tst_QExifImageHeader::hardening_data()
     QTest::addColumn<QList<int>>("extendedTags");
     QTest::addColumn<int>("thumbnailSize");
 
-    const auto refused = [](const char *name, const QByteArray &jpeg) {
-        QTest::newRow(name) << jpeg << QList<int>() << QList<int>() << 0;
+    const auto row = [](const char *name, const QByteArray &jpeg, QList<int> image = {}, QList<int> extended = {}) {
+        QTest::newRow(name) << jpeg << image << extended << 0;
     };
-    refused("segment length 0", QByteArray("\xff\xd8\xff\xe0\0\0\xff\xe1\0\0", 10));
-    refused("segment length 1", QByteArray("\xff\xd8\xff\xdb\0\x01xxxx", 10));
-    refused("walk runs off the end", QByteArray("\xff\xd8\xff\xe0\0\x10JFIF", 10));
-    refused("only SOI", QByteArray("\xff\xd8", 2));
-    refused("no SOI", QByteArray("\xff\xe1\0\x10" "Exif\0\0II*\0", 14));
-    refused("APP1 shorter than its signature", QByteArray("\xff\xd8\xff\xe1\0\x06Exif\0\0", 12));
-    refused("IFD0 outside the block", app1(TiffBuilder().u32(4000).u16(0).data));
-    refused("bad magic", app1(QByteArray("II\x2b\0\x08\0\0\0\0\0", 10)));
-    refused("bad byte order", app1(QByteArray("IM\x2a\0\x08\0\0\0\0\0", 10)));
-
-    TiffBuilder past;
-    past.u32(8).u16(3).entry(270, 2, 1000, 20).entry(273, 4, 0x40000000, 8).entry(274, 3, 1, 6).u32(0);
-    QTest::newRow("counts past the block") << app1(past.data) << QList<int>{270, 273, 274} << QList<int>() << 0;
-    TiffBuilder truncated;
-    truncated.u32(8).u16(50).entry(271, 2, 2, 0x41).entry(272, 2, 2, 0x42);
-    QTest::newRow("IFD cut short") << app1(truncated.data) << QList<int>{271, 272} << QList<int>() << 0;
-    TiffBuilder selfLoop;
-    selfLoop.u32(8).u16(2).entry(271, 2, 2, 0x41).entry(34665, 4, 1, 8).u32(8);
-    QTest::newRow("IFDs pointing back at IFD0") << app1(selfLoop.data) << QList<int>{271} << QList<int>() << 0;
-    TiffBuilder exifLoop;
-    exifLoop.u32(8).u16(3).entry(271, 2, 2, 0x41).entry(34665, 4, 1, 50).entry(34853, 4, 1, 50).u32(50);
-    exifLoop.u16(1).entry(33434, 4, 1, 9).u32(0);
-    QTest::newRow("GPS and IFD1 at the Exif IFD") << app1(exifLoop.data) << QList<int>{271} << QList<int>{33434} << 0;
+    row("segment length 0", QByteArray("\xff\xd8\xff\xe0\0\0\xff\xe1\0\0", 10));
+    row("segment length 1", QByteArray("\xff\xd8\xff\xdb\0\x01xxxx", 10));
+    row("walk runs off the end", QByteArray("\xff\xd8\xff\xe0\0\x10JFIF", 10));
+    row("only SOI", QByteArray("\xff\xd8", 2));
+    row("no SOI", QByteArray("\xff\xe1\0\x10" "Exif\0\0II*\0", 14));
+    row("APP1 shorter than its signature", QByteArray("\xff\xd8\xff\xe1\0\x06Exif\0\0", 12));
+    row("IFD0 outside the block", app1(TiffBuilder().u32(4000).u16(0).data));
+    row("bad magic", app1(QByteArray("II\x2b\0\x08\0\0\0\0\0", 10)));
+    row("bad byte order", app1(QByteArray("IM\x2a\0\x08\0\0\0\0\0", 10)));
+    row("counts past the block",
+        app1(TiffBuilder().u32(8).u16(3).entry(270, 2, 1000, 20).entry(273, 4, 0x40000000, 8).entry(274, 3, 1, 6).u32(0).data),
+        {270, 273, 274});
+    row("IFD cut short", app1(TiffBuilder().u32(8).u16(50).entry(271, 2, 2, 0x41).entry(272, 2, 2, 0x42).data), {271, 272});
+    row("IFDs pointing back at IFD0",
+        app1(TiffBuilder().u32(8).u16(2).entry(271, 2, 2, 0x41).entry(34665, 4, 1, 8).u32(8).data), {271});
+    row("GPS and IFD1 at the Exif IFD",
+        app1(TiffBuilder().u32(8).u16(3).entry(271, 2, 2, 0x41).entry(34665, 4, 1, 50).entry(34853, 4, 1, 50).u32(50)
+                 .u16(1).entry(33434, 4, 1, 9).u32(0).data),
+        {271}, {33434});
     TiffBuilder thumbnail;
-    thumbnail.u32(8).u16(1).entry(271, 2, 2, 0x41).u32(26);
-    thumbnail.u16(2).entry(513, 4, 1, 0x7ffffff0).entry(514, 4, 1, 0x7fffffff).u32(0);
-    QTest::newRow("thumbnail outside the block") << app1(thumbnail.data) << QList<int>{271} << QList<int>() << 0;
-    TiffBuilder good;
-    good.u32(8).u16(1).entry(271, 2, 2, 0x41).u32(26);
-    good.u16(2).entry(513, 4, 1, 56).entry(514, 4, 1, 4).u32(0).data.append("\xff\xd8\xff\xd9");
-    QTest::newRow("thumbnail inside the block") << app1(good.data) << QList<int>{271} << QList<int>() << 4;
+    thumbnail.u32(8).u16(1).entry(271, 2, 2, 0x41).u32(26).u16(2);
+    row("thumbnail outside the block",
+        app1(TiffBuilder(thumbnail).entry(513, 4, 1, 0x7ffffff0).entry(514, 4, 1, 0x7fffffff).u32(0).data), {271});
+    thumbnail.entry(513, 4, 1, 56).entry(514, 4, 1, 4).u32(0).data.append("\xff\xd8\xff\xd9");
+    QTest::newRow("thumbnail inside the block") << app1(thumbnail.data) << QList<int>{271} << QList<int>() << 4;
 }
 
 void tst_QExifImageHeader::hardening()
