@@ -1,6 +1,5 @@
 #include "ExifTestSupport.h"
 
-#include <QDir>
 #include <QFile>
 #include <QImage>
 #include <QJsonArray>
@@ -20,30 +19,14 @@ QString describe(const QExifValue &value)
             items.append(QStringLiteral("%1/%2").arg(v.first).arg(v.second));
     };
     switch (value.type()) {
-    case QExifValue::Byte:
-        numbers(value.toByteVector());
-        break;
-    case QExifValue::Ascii:
-        items.append(value.toString());
-        break;
-    case QExifValue::Short:
-        numbers(value.toShortVector());
-        break;
-    case QExifValue::Long:
-        numbers(value.toLongVector());
-        break;
-    case QExifValue::Rational:
-        pairs(value.toRationalVector());
-        break;
-    case QExifValue::Undefined:
-        items.append(QString::fromLatin1(value.toByteArray().toPercentEncoding()));
-        break;
-    case QExifValue::SignedLong:
-        numbers(value.toSignedLongVector());
-        break;
-    case QExifValue::SignedRational:
-        pairs(value.toSignedRationalVector());
-        break;
+    case QExifValue::Byte: numbers(value.toByteVector()); break;
+    case QExifValue::Ascii: items.append(value.toString()); break;
+    case QExifValue::Short: numbers(value.toShortVector()); break;
+    case QExifValue::Long: numbers(value.toLongVector()); break;
+    case QExifValue::Rational: pairs(value.toRationalVector()); break;
+    case QExifValue::Undefined: items.append(QString::fromLatin1(value.toByteArray().toPercentEncoding())); break;
+    case QExifValue::SignedLong: numbers(value.toSignedLongVector()); break;
+    case QExifValue::SignedRational: pairs(value.toSignedRationalVector()); break;
     }
     return QString::number(value.type()) + QLatin1Char(':') + items.join(QLatin1Char(','));
 }
@@ -96,18 +79,6 @@ QList<Segment> segments(const QByteArray &jpeg, int *sosOffset)
     if (sosOffset)
         *sosOffset = -1;
     return result;
-}
-
-QByteArray assemble(const QList<Segment> &segments, const QByteArray &scanAndRest)
-{
-    QByteArray jpeg("\xff\xd8", 2);
-    for (const Segment &segment : segments) {
-        const int length = segment.data.size() + 2;
-        const char head[4] = {char(segment.marker >> 8), char(segment.marker), char(length >> 8), char(length)};
-        jpeg.append(head, 4);
-        jpeg.append(segment.data);
-    }
-    return jpeg + scanAndRest;
 }
 
 QByteArray readFile(const QString &path)

@@ -48,9 +48,6 @@ QJsonObject exiftoolRead(const QString &path, const QStringList &arguments = QSt
 // The segments ahead of Start of Scan (SOI excluded) and the offset of SOS.
 QList<Segment> segments(const QByteArray &jpeg, int *sosOffset = nullptr);
 
-// A JPEG put together again from SOI, the segments and everything from SOS on.
-QByteArray assemble(const QList<Segment> &segments, const QByteArray &scanAndRest);
-
 QByteArray readFile(const QString &path);
 bool writeFile(const QString &path, const QByteArray &data);
 
@@ -62,7 +59,13 @@ bool editSegments(const QString &path, Edit edit)
     const QByteArray jpeg = readFile(path);
     QList<Segment> list = segments(jpeg, &sos);
     edit(list);
-    return sos > 0 && writeFile(path, assemble(list, jpeg.mid(sos)));
+    QByteArray edited("\xff\xd8", 2);
+    for (const Segment &segment : list) {
+        const int length = segment.data.size() + 2;
+        edited.append(char(segment.marker >> 8)).append(char(segment.marker)).append(char(length >> 8)).append(char(length));
+        edited.append(segment.data);
+    }
+    return sos > 0 && writeFile(path, edited + jpeg.mid(sos));
 }
 
 } // namespace ExifTestSupport

@@ -11,21 +11,20 @@ using namespace ExifTestSupport;
 
 namespace {
 
-// Reads numbers out of a little-endian TIFF block the way a plain reader would.
+// Reads a little-endian TIFF block the way a plain reader would; entry i of the IFD at ifd.
 struct Block
 {
     QByteArray data;
 
     quint16 u16(int offset) const { return quint16(uchar(data.at(offset)) | uchar(data.at(offset + 1)) << 8); }
     quint32 u32(int offset) const { return u16(offset) | quint32(u16(offset + 2)) << 16; }
-    // Entry i of the IFD at offset: tag, count, last word (raw or as a number).
     quint16 tag(int ifd, int i) const { return u16(ifd + 2 + 12 * i); }
     quint32 count(int ifd, int i) const { return u32(ifd + 2 + 12 * i + 4); }
     quint32 word(int ifd, int i) const { return u32(ifd + 2 + 12 * i + 8); }
     QByteArray raw(int ifd, int i) const { return data.mid(ifd + 2 + 12 * i + 8, 4); }
 };
 
-// Builds a little-endian TIFF block by hand, for inputs our writer never makes.
+// A little-endian TIFF block by hand, for inputs our writer never makes.
 struct TiffBuilder
 {
     QByteArray data = QByteArray("II\x2a\0", 4);
@@ -38,9 +37,8 @@ struct TiffBuilder
     }
 };
 
-class SequentialBuffer : public QBuffer
+struct SequentialBuffer : QBuffer
 {
-public:
     using QBuffer::QBuffer;
     bool isSequential() const override { return true; }
 };
@@ -52,7 +50,6 @@ QByteArray app1(const QByteArray &tiff)
     return QByteArray("\xff\xd8\xff\xe1", 4) + char(length >> 8) + char(length) + body + QByteArray("\xff\xd9", 2);
 }
 
-// A header read from a TIFF block.
 struct Reread : QExifImageHeader
 {
     explicit Reread(const QByteArray &block) { read(block); }
@@ -70,8 +67,7 @@ private slots:
     void exiftoolRoundTrip();
     void onlyTheFirstApp1Counts();
     void blockLayout();
-    void secondSaveRepeatsGpsPointer();
-    void thumbnailLayout();
+    void thumbnailDefaults();
     void inlineValues_data();
     void inlineValues();
     void unknownTypeWarns();
@@ -102,9 +98,8 @@ QString tst_QExifImageHeader::taggedFile(const QString &name, const QString &byt
 {
     const QString path = m_dir.filePath(name);
     const QStringList arguments{"-ExifByteOrder=" + byteOrder, "-Make=Acme", "-Model=Cam 1", "-Artist=Ann",
-                                "-Orientation#=6", "-XResolution=300", "-DateTimeOriginal=2024:05:06 07:08:09",
-                                "-ExposureTime=0.01", "-ISO=200", "-ExposureCompensation=-0.5", "-InteropIndex=R98",
-                                "-GPSLatitude=33.5", "-GPSLatitudeRef=S", "-GPSAltitude=12.5",
+                                "-Orientation#=6", "-XResolution=300", "-ExposureTime=0.01", "-ExposureCompensation=-0.5",
+                                "-InteropIndex=R98", "-GPSLatitude=33.5", "-GPSLatitudeRef=S",
                                 "-ThumbnailImage<=" + m_thumbnail, "-XMP-dc:Title=Loom"};
     return makeJpeg(path) && exiftoolWrite(path, arguments) ? path : QString();
 }
@@ -123,37 +118,24 @@ void tst_QExifImageHeader::exiftoolRoundTrip()
     const QString path = taggedFile(QStringLiteral("trip-%1.jpg").arg(byteOrder), byteOrder);
     QVERIFY(!path.isEmpty());
     const bool le = byteOrder == QLatin1String("II");
-    int scanStart = -1;
-    segments(readFile(path), &scanStart);
-    const QByteArray scan = readFile(path).mid(scanStart);
+    int sos = -1;
+    segments(readFile(path), &sos);
+    const QByteArray scan = readFile(path).mid(sos);
 
-    // Reading what exiftool wrote.
+    // What the camera files don't show: inline text, the pointers, signed and reversed values.
     QExifImageHeader header;
     QVERIFY(header.loadFromJpeg(path));
-    QCOMPARE(header.byteOrder(), le ? QDataStream::LittleEndian : QDataStream::BigEndian);
-    QCOMPARE(header.imageValue(271).toString(), QStringLiteral("Acme"));
-    QCOMPARE(header.imageValue(315).toString(), QStringLiteral("Ann")); // inline ASCII
-    QCOMPARE(header.imageValue(274).toShort(), quint16(6));
+    QCOMPARE(header.imageValue(315).toString(), QStringLiteral("Ann"));
     QCOMPARE(header.imageValue(282).toRational(), QExifURational(300, 1));
-    QVERIFY(!header.containsImageTag(34665));
-    QVERIFY(!header.containsImageTag(34853));
-    QCOMPARE(header.extendedValue(36867).toString(), QStringLiteral("2024:05:06 07:08:09"));
-    QCOMPARE(ratio(header.extendedValue(33434).toRational()), 0.01);
-    QCOMPARE(header.extendedValue(34855).toShort(), quint16(200));
+    // The IFD pointers are structure, not tags.
+    QVERIFY(!header.containsImageTag(34665) && !header.containsImageTag(34853) && !header.containsExtendedTag(40965));
     QCOMPARE(ratio(header.extendedValue(37380).toSignedRational()), -0.5);
-    QVERIFY(!header.containsExtendedTag(40965));
-    // Short UNDEFINED values lie in the entry as a word: big-endian files
-    // give them back reversed.
+    // Short UNDEFINED values lie in the entry as a word: big-endian files give them back reversed.
     QCOMPARE(header.extendedValue(36864).toByteArray(), le ? QByteArray("0232") : QByteArray("2320"));
     QCOMPARE(header.gpsValue(0).toByteVector(), (QVector<quint8>{2, 3, 0, 0}));
-    QCOMPARE(header.gpsValue(1).toString(), QStringLiteral("S"));
     const QVector<QExifURational> latitude = header.gpsValue(2).toRationalVector();
-    QCOMPARE(latitude.size(), 3);
-    QCOMPARE(ratio(latitude[0]) + ratio(latitude[1]) / 60 + ratio(latitude[2]) / 3600, 33.5);
-    QCOMPARE(ratio(header.gpsValue(6).toRational()), 12.5);
     QCOMPARE(header.thumbnailData(), readFile(m_thumbnail));
 
-    // Saving it again with some changes.
     header.setImageValue(271, QExifValue(QStringLiteral("Loomkit")));
     header.setExtendedValue(37510, QExifValue(QStringLiteral("hello"), QExifValue::AsciiEncoding));
     header.setExtendedValue(37382, QExifValue(QExifURational(5, 2)));
@@ -161,7 +143,6 @@ void tst_QExifImageHeader::exiftoolRoundTrip()
     QVERIFY(!QFile::exists(path + QLatin1String(".tmp")));
 
     // One APP1 first, all other application segments gone, the scan intact.
-    int sos = -1;
     const QByteArray saved = readFile(path);
     const QList<Segment> list = segments(saved, &sos);
     QCOMPARE(list.first().marker, quint16(0xffe1));
@@ -169,27 +150,19 @@ void tst_QExifImageHeader::exiftoolRoundTrip()
         QVERIFY2(list[i].marker < 0xffe0 || list[i].marker > 0xffef, qPrintable(QString::number(list[i].marker, 16)));
     QCOMPARE(saved.mid(sos), scan);
 
-    const QJsonObject tags = exiftoolRead(path);
     const QJsonObject validation = exiftoolRead(path, {"-validate", "-error"});
-    QVERIFY(validation.contains("ExifTool:Validate"));
-    QVERIFY(!validation.contains("ExifTool:Error"));
-    QCOMPARE(tags.value("ExifIFD:UserComment").toString(), QStringLiteral("hello"));
-    QCOMPARE(tags.value("IFD0:Make").toString(), QStringLiteral("Loomkit"));
-    QCOMPARE(tags.value("IFD0:Model").toString(), QStringLiteral("Cam 1"));
-    QCOMPARE(tags.value("IFD0:Artist").toString(), QStringLiteral("Ann"));
-    QCOMPARE(tags.value("IFD0:Orientation").toInt(), 6);
-    QCOMPARE(tags.value("ExifIFD:ExposureTime").toDouble(), 0.01);
-    QCOMPARE(tags.value("ExifIFD:ISO").toInt(), 200);
-    QCOMPARE(tags.value("ExifIFD:ExposureCompensation").toDouble(), -0.5);
-    QCOMPARE(tags.value("ExifIFD:SubjectDistance").toDouble(), 2.5);
-    QCOMPARE(tags.value("GPS:GPSLatitude").toDouble(), 33.5);
-    QCOMPARE(tags.value("GPS:GPSLatitudeRef").toString(), QStringLiteral("S"));
-    // The interoperability IFD and the XMP segment are not carried over.
-    QVERIFY(!tags.contains("InteropIFD:InteropIndex"));
-    QVERIFY(!tags.contains("XMP-dc:Title"));
+    QVERIFY(validation.contains("ExifTool:Validate") && !validation.contains("ExifTool:Error"));
+    const QJsonObject tags = exiftoolRead(path);
+    const QList<QPair<QString, QJsonValue>> expected{
+        {"ExifIFD:UserComment", "hello"}, {"IFD0:Make", "Loomkit"}, {"IFD0:Model", "Cam 1"}, {"IFD0:Artist", "Ann"},
+        {"IFD0:Orientation", 6}, {"ExifIFD:ExposureTime", 0.01}, {"ExifIFD:ExposureCompensation", -0.5},
+        {"ExifIFD:SubjectDistance", 2.5}, {"GPS:GPSLatitude", 33.5}, {"GPS:GPSLatitudeRef", "S"},
+        // The interoperability IFD and the XMP segment are not carried over.
+        {"InteropIFD:InteropIndex", QJsonValue::Undefined}, {"XMP-dc:Title", QJsonValue::Undefined}};
+    for (const auto &tag : expected)
+        QVERIFY2(tags.value(tag.first) == tag.second, qPrintable(tag.first));
     // Reversed short UNDEFINED values are written as they were read.
-    QCOMPARE(tags.value("ExifIFD:ExifVersion").toVariant().toString(),
-             le ? QStringLiteral("0232") : QStringLiteral("2320"));
+    QCOMPARE(tags.value("ExifIFD:ExifVersion").toVariant().toString(), le ? QStringLiteral("0232") : QStringLiteral("2320"));
     QCOMPARE(TestSupport::run("exiftool", {"-b", "-ThumbnailImage", path}), readFile(m_thumbnail));
 
     // What we wrote, we read back; the GPS pointer added on saving is dropped.
@@ -207,39 +180,31 @@ void tst_QExifImageHeader::onlyTheFirstApp1Counts()
 {
     SKIP_WITHOUT_EXIFTOOL();
     const QString path = taggedFile(QStringLiteral("xmp-first.jpg"), QStringLiteral("II"));
-    QVERIFY(!path.isEmpty());
     QExifImageHeader header;
     QVERIFY(header.loadFromJpeg(path));
 
-    // Move the XMP segment ahead of the Exif one: now there is no Exif data.
+    // The XMP segment moved ahead of the Exif one: other readers still see the Exif data, we don't.
     QVERIFY(editSegments(path, [](QList<Segment> &list) {
         for (int i = 1; i < list.size(); ++i) {
             if (list[i].marker == 0xffe1 && list[i].data.startsWith("http://ns.adobe.com/xap/1.0/"))
                 list.prepend(list.takeAt(i));
         }
     }));
-    QVERIFY(readFile(path).mid(6).startsWith("http://ns.adobe.com/xap/1.0/"));
     QVERIFY(!exiftoolRead(path).value("IFD0:Make").toString().isEmpty());
     QVERIFY(!header.loadFromJpeg(path));
     QVERIFY(header.imageTags().isEmpty());
-
-    // The corpus files whose APP1 holds XMP only.
-    for (const QString &name : {QStringLiteral("image01551.jpg"), QStringLiteral("image02206.jpg")})
-        QVERIFY(!header.loadFromJpeg(TestSupport::dataPath(QStringLiteral("exif/broken/") + name)));
 }
 
 void tst_QExifImageHeader::blockLayout()
 {
     QExifImageHeader header;
-    header.setImageValue(270, QExifValue(QStringLiteral("abc")));       // inline, count 4
+    header.setImageValue(270, QExifValue(QStringLiteral("abc")));
     header.setImageValue(271, QExifValue(QStringLiteral("Acme Corp"))); // count 10
     header.setExtendedValue(36864, QExifValue(QByteArray("0230")));
     header.setExtendedValue(33434, QExifValue(QExifURational(1, 100)));
 
     // IFD0 holds its entries and the Exif pointer, then its values.
     const Block block{header.toTiffBlock()};
-    QCOMPARE(block.data.left(10), QByteArray("II\x2a\0\x08\0\0\0\3\0", 10));
-    QCOMPARE(block.raw(8, 0), QByteArray("abc\0", 4));
     QCOMPARE(block.word(8, 1), 26u + 12 * 2);
     QCOMPARE(block.u32(8 + 2 + 36), 0u); // next IFD: no thumbnail
     QCOMPARE(block.data.mid(50, 10), QByteArray("Acme Corp\0", 10));
@@ -253,50 +218,35 @@ void tst_QExifImageHeader::blockLayout()
     QCOMPARE(header.size(), qint64(block.data.size()));
     QCOMPARE(block.data.size(), exif + 2 + 24 + 8 + 4);
     QCOMPARE(Reread(block.data).extendedTags(), (QList<int>{33434, 36864}));
-}
 
-void tst_QExifImageHeader::secondSaveRepeatsGpsPointer()
-{
-    QExifImageHeader header;
-    header.setImageValue(271, QExifValue(QStringLiteral("Acme")));
+    // The GPS pointer stays in the map, so a second save writes a stale copy among the sorted entries.
     header.setGpsValue(1, QExifValue(QStringLiteral("N")));
-
     const Block first{header.toTiffBlock()};
-    QCOMPARE(first.u16(8), quint16(3));
     const Block second{header.toTiffBlock()};
-    QCOMPARE(second.u16(8), quint16(4));
-    QCOMPARE(second.tag(8, 1), quint16(34853)); // the stale copy, among the sorted entries
-    QCOMPARE(second.word(8, 1), first.word(8, 2));
-    QCOMPARE(second.tag(8, 3), quint16(34853));
-    QCOMPARE(second.word(8, 3), first.word(8, 2) + 12);
+    QCOMPARE(second.u16(8), quint16(5));
+    QCOMPARE(second.tag(8, 2), quint16(34853));
+    QCOMPARE(second.word(8, 2), first.word(8, 3));
+    QCOMPARE(second.tag(8, 4), quint16(34853));
+    QCOMPARE(second.word(8, 4), first.word(8, 3) + 12);
     QCOMPARE(second.data.size(), first.data.size() + 12);
-
-    // A reader drops both copies.
-    const Reread back(second.data);
-    QCOMPARE(back.imageTags(), QList<int>{271});
+    const Reread back(second.data); // a reader drops both copies
+    QCOMPARE(back.imageTags(), (QList<int>{270, 271}));
     QCOMPARE(back.gpsValue(1).toString(), QStringLiteral("N"));
 }
 
-void tst_QExifImageHeader::thumbnailLayout()
+void tst_QExifImageHeader::thumbnailDefaults()
 {
     QExifImageHeader header;
     const QByteArray thumbnail = QByteArray("\xff\xd8thumbnail\xff\xd9");
     header.setThumbnailData(thumbnail);
     header.setThumbnailXResolution(QExifValue(QExifURational(96, 1)));
 
-    // IFD1 follows IFD0 and its next word; the data comes last.
-    const Block block{header.toTiffBlock()};
-    const int ifd1 = int(block.u32(8 + 2 + 12));
-    QCOMPARE(ifd1, 8 + 2 + 12 + 4 + 2 + 4);
-    QCOMPARE(block.u16(ifd1), quint16(7));
-    QVERIFY(block.data.endsWith(thumbnail));
     // Unset values get defaults: 72 dpi and orientation 0.
-    Reread back(block.data);
+    Reread back(header.toTiffBlock());
     QCOMPARE(back.thumbnailData(), thumbnail);
     QCOMPARE(back.thumbnailXResolution().toRational(), QExifURational(96, 1));
     QCOMPARE(back.thumbnailYResolution().toRational(), QExifURational(72, 1));
-    QCOMPARE(back.thumbnailOrientation().toShort(), quint16(0));
-    QCOMPARE(back.thumbnailOrientation().type(), int(QExifValue::Short));
+    QCOMPARE(describe(back.thumbnailOrientation()), QStringLiteral("3:0"));
     // clear keeps the thumbnail's values but drops its data.
     back.clear();
     QVERIFY(back.thumbnailData().isEmpty());
@@ -344,12 +294,9 @@ void tst_QExifImageHeader::inlineValues()
     for (QDataStream::ByteOrder order : {QDataStream::LittleEndian, QDataStream::BigEndian}) {
         header.setByteOrder(order);
         const QExifValue back = Reread(header.toTiffBlock()).imageValue(700);
-        QCOMPARE(back.count(), value.count());
         // Big-endian: a short UNDEFINED value comes back as the reversed word's first bytes.
-        if (value.type() == QExifValue::Undefined && order == QDataStream::BigEndian)
-            QCOMPARE(describe(back), QStringLiteral("7:%00%00"));
-        else
-            QCOMPARE(describe(back), describe(value));
+        const bool reversed = value.type() == QExifValue::Undefined && order == QDataStream::BigEndian;
+        QCOMPARE(describe(back), reversed ? QStringLiteral("7:%00%00") : describe(value));
     }
 }
 
@@ -360,8 +307,8 @@ void tst_QExifImageHeader::unknownTypeWarns()
     header.setExtendedValue(301, QExifValue());
     header.setExtendedValue(302, QExifValue(QVector<quint32>{7, 8}));
     header.setGpsValue(1, QExifValue(QStringLiteral("N")));
-    QTest::ignoreMessage(QtWarningMsg, QRegularExpression(QStringLiteral("Invalid Ifd Type 0$")));
-    QTest::ignoreMessage(QtWarningMsg, QRegularExpression(QStringLiteral("Invalid Ifd Type 0$")));
+    for (int i = 0; i < 2; ++i)
+        QTest::ignoreMessage(QtWarningMsg, QRegularExpression(QStringLiteral("Invalid Ifd Type 0$")));
     const Block block{header.toTiffBlock()};
     QCOMPARE(block.tag(8, 0), quint16(300));
     QCOMPARE(block.u16(8 + 2 + 2), quint16(0)); // type
@@ -377,8 +324,7 @@ void tst_QExifImageHeader::unknownTypeWarns()
     tiff.u32(8).u16(1).entry(400, 13, 1, 5).u32(0);
     QTest::ignoreMessage(QtWarningMsg, QRegularExpression(QStringLiteral("Invalid Ifd Type 13$")));
     const Reread back(tiff.data);
-    QVERIFY(back.containsImageTag(400));
-    QVERIFY(back.imageValue(400).isNull());
+    QVERIFY(back.containsImageTag(400) && back.imageValue(400).isNull());
 }
 
 void tst_QExifImageHeader::cameraFiles_data()
@@ -399,11 +345,11 @@ void tst_QExifImageHeader::cameraFiles()
     QFETCH(QString, path);
     const QJsonObject tags = exiftoolRead(path);
     QVERIFY(!tags.isEmpty());
+    const auto tag = [&](const char *key) { return tags.value(QLatin1String(key)); };
 
     QExifImageHeader header;
     QVERIFY(header.loadFromJpeg(path));
-    const QString order = tags.value("File:ExifByteOrder").toString();
-    QCOMPARE(header.byteOrder(), order == QLatin1String("II") ? QDataStream::LittleEndian : QDataStream::BigEndian);
+    QCOMPARE(header.byteOrder(), tag("File:ExifByteOrder") == "II" ? QDataStream::LittleEndian : QDataStream::BigEndian);
 
     // exiftool trims trailing blanks and NULs; we drop the last byte of the
     // count whether or not it is the terminator.
@@ -412,31 +358,24 @@ void tst_QExifImageHeader::cameraFiles()
         const QString actual = QString(ours).remove(QChar(0)).trimmed();
         return expected.startsWith(actual) && expected.size() - actual.size() <= 1;
     };
-    const auto has = [&](const char *key) { return tags.contains(QLatin1String(key)); };
-    const auto tag = [&](const char *key) { return tags.value(QLatin1String(key)); };
-    const QList<QPair<int, const char *>> texts{{271, "IFD0:Make"}, {272, "IFD0:Model"}, {306, "IFD0:ModifyDate"}};
-    for (const auto &text : texts) {
-        if (has(text.second))
+    for (const auto &text : QList<QPair<int, const char *>>{{271, "IFD0:Make"}, {272, "IFD0:Model"}, {306, "IFD0:ModifyDate"}}) {
+        if (tags.contains(QLatin1String(text.second)))
             QVERIFY2(sameText(header.imageValue(text.first).toString(), tag(text.second)), text.second);
         else QVERIFY(!header.containsImageTag(text.first));
     }
-    if (has("IFD0:Orientation"))
+    if (tags.contains("IFD0:Orientation"))
         QCOMPARE(int(header.imageValue(274).toShort()), tag("IFD0:Orientation").toInt());
-    if (has("ExifIFD:DateTimeOriginal"))
+    if (tags.contains("ExifIFD:DateTimeOriginal"))
         QVERIFY(sameText(header.extendedValue(36867).toString(), tag("ExifIFD:DateTimeOriginal")));
-    if (has("GPS:GPSLatitude")) {
+    if (tags.contains("GPS:GPSLatitude")) {
         const QVector<QExifURational> v = header.gpsValue(2).toRationalVector();
         QCOMPARE(v.size(), 3);
-        const double degrees = ratio(v[0]) + ratio(v[1]) / 60 + ratio(v[2]) / 3600;
-        QVERIFY(qAbs(degrees - tag("GPS:GPSLatitude").toDouble()) < 1e-6);
+        QVERIFY(qAbs(ratio(v[0]) + ratio(v[1]) / 60 + ratio(v[2]) / 3600 - tag("GPS:GPSLatitude").toDouble()) < 1e-6);
     }
-    const int thumbnailLength = tag("IFD1:ThumbnailLength").toInt();
-    if (tag("IFD1:ThumbnailOffset").isDouble() && thumbnailLength > 0)
-        QCOMPARE(header.thumbnailData().size(), thumbnailLength);
+    if (tag("IFD1:ThumbnailOffset").isDouble() && tag("IFD1:ThumbnailLength").toInt() > 0)
+        QCOMPARE(header.thumbnailData().size(), tag("IFD1:ThumbnailLength").toInt());
     // Every IFD0 tag exiftool lists is in the map.
-    int listed = 0;
-    for (auto it = tags.begin(); it != tags.end(); ++it)
-        listed += it.key().startsWith(QLatin1String("IFD0:")) ? 1 : 0;
+    const int listed = tags.keys().filter(QRegularExpression(QStringLiteral("^IFD0:"))).size();
     QVERIFY2(header.imageTags().size() >= listed, qPrintable(QString::number(header.imageTags().size())));
 
     // Rewriting keeps the values a reader can see. Files with no image
@@ -445,7 +384,7 @@ void tst_QExifImageHeader::cameraFiles()
     QFile::remove(copy);
     QVERIFY(QFile::copy(path, copy));
     QFile::setPermissions(copy, QFile::ReadOwner | QFile::WriteOwner);
-    if (!has("File:ImageWidth")) {
+    if (!tags.contains("File:ImageWidth")) {
         QVERIFY(!header.saveToJpeg(copy));
         QCOMPARE(readFile(copy), readFile(path));
         return;
@@ -454,7 +393,7 @@ void tst_QExifImageHeader::cameraFiles()
     const QJsonObject rewritten = exiftoolRead(copy);
     QVERIFY(!rewritten.contains("ExifTool:Error"));
     for (const char *key : {"IFD0:Model", "ExifIFD:DateTimeOriginal"}) {
-        if (has(key))
+        if (tags.contains(QLatin1String(key)))
             QVERIFY2(sameText(rewritten.value(QLatin1String(key)).toVariant().toString(), tag(key)), key);
     }
     QCOMPARE(rewritten.value("GPS:GPSLatitude"), tag("GPS:GPSLatitude"));
@@ -491,8 +430,7 @@ void tst_QExifImageHeader::hostileInputs()
     buffer.setData(app1(data.left(65000)));
     QVERIFY(buffer.open(QIODevice::ReadOnly));
     const bool wrappedLoaded = wrapped.loadFromJpeg(&buffer);
-    // Whatever was read can be written again.
-    header.toTiffBlock();
+    header.toTiffBlock(); // whatever was read can be written again
     QLoggingCategory::setFilterRules(QString());
 
     if (bare && data.size() <= 65000)
@@ -517,40 +455,34 @@ void tst_QExifImageHeader::hardening_data()
     QTest::addColumn<QList<int>>("extendedTags");
     QTest::addColumn<int>("thumbnailSize");
 
-    const auto refused = [](const char *name, const QByteArray &jpeg) {
-        QTest::newRow(name) << jpeg << QList<int>() << QList<int>() << 0;
+    const auto row = [](const char *name, const QByteArray &jpeg, QList<int> image = {}, QList<int> extended = {}) {
+        QTest::newRow(name) << jpeg << image << extended << 0;
     };
-    refused("segment length 0", QByteArray("\xff\xd8\xff\xe0\0\0\xff\xe1\0\0", 10));
-    refused("segment length 1", QByteArray("\xff\xd8\xff\xdb\0\x01xxxx", 10));
-    refused("walk runs off the end", QByteArray("\xff\xd8\xff\xe0\0\x10JFIF", 10));
-    refused("only SOI", QByteArray("\xff\xd8", 2));
-    refused("no SOI", QByteArray("\xff\xe1\0\x10" "Exif\0\0II*\0", 14));
-    refused("APP1 shorter than its signature", QByteArray("\xff\xd8\xff\xe1\0\x06Exif\0\0", 12));
-    refused("IFD0 outside the block", app1(TiffBuilder().u32(4000).u16(0).data));
-    refused("bad magic", app1(QByteArray("II\x2b\0\x08\0\0\0\0\0", 10)));
-    refused("bad byte order", app1(QByteArray("IM\x2a\0\x08\0\0\0\0\0", 10)));
-
-    TiffBuilder past;
-    past.u32(8).u16(3).entry(270, 2, 1000, 20).entry(273, 4, 0x40000000, 8).entry(274, 3, 1, 6).u32(0);
-    QTest::newRow("counts past the block") << app1(past.data) << QList<int>{270, 273, 274} << QList<int>() << 0;
-    TiffBuilder truncated;
-    truncated.u32(8).u16(50).entry(271, 2, 2, 0x41).entry(272, 2, 2, 0x42);
-    QTest::newRow("IFD cut short") << app1(truncated.data) << QList<int>{271, 272} << QList<int>() << 0;
-    TiffBuilder selfLoop;
-    selfLoop.u32(8).u16(2).entry(271, 2, 2, 0x41).entry(34665, 4, 1, 8).u32(8);
-    QTest::newRow("IFDs pointing back at IFD0") << app1(selfLoop.data) << QList<int>{271} << QList<int>() << 0;
-    TiffBuilder exifLoop;
-    exifLoop.u32(8).u16(3).entry(271, 2, 2, 0x41).entry(34665, 4, 1, 50).entry(34853, 4, 1, 50).u32(50);
-    exifLoop.u16(1).entry(33434, 4, 1, 9).u32(0);
-    QTest::newRow("GPS and IFD1 at the Exif IFD") << app1(exifLoop.data) << QList<int>{271} << QList<int>{33434} << 0;
+    row("segment length 0", QByteArray("\xff\xd8\xff\xe0\0\0\xff\xe1\0\0", 10));
+    row("segment length 1", QByteArray("\xff\xd8\xff\xdb\0\x01xxxx", 10));
+    row("walk runs off the end", QByteArray("\xff\xd8\xff\xe0\0\x10JFIF", 10));
+    row("only SOI", QByteArray("\xff\xd8", 2));
+    row("no SOI", QByteArray("\xff\xe1\0\x10" "Exif\0\0II*\0", 14));
+    row("APP1 shorter than its signature", QByteArray("\xff\xd8\xff\xe1\0\x06Exif\0\0", 12));
+    row("IFD0 outside the block", app1(TiffBuilder().u32(4000).u16(0).data));
+    row("bad magic", app1(QByteArray("II\x2b\0\x08\0\0\0\0\0", 10)));
+    row("bad byte order", app1(QByteArray("IM\x2a\0\x08\0\0\0\0\0", 10)));
+    row("counts past the block",
+        app1(TiffBuilder().u32(8).u16(3).entry(270, 2, 1000, 20).entry(273, 4, 0x40000000, 8).entry(274, 3, 1, 6).u32(0).data),
+        {270, 273, 274});
+    row("IFD cut short", app1(TiffBuilder().u32(8).u16(50).entry(271, 2, 2, 0x41).entry(272, 2, 2, 0x42).data), {271, 272});
+    row("IFDs pointing back at IFD0",
+        app1(TiffBuilder().u32(8).u16(2).entry(271, 2, 2, 0x41).entry(34665, 4, 1, 8).u32(8).data), {271});
+    row("GPS and IFD1 at the Exif IFD",
+        app1(TiffBuilder().u32(8).u16(3).entry(271, 2, 2, 0x41).entry(34665, 4, 1, 50).entry(34853, 4, 1, 50).u32(50)
+                 .u16(1).entry(33434, 4, 1, 9).u32(0).data),
+        {271}, {33434});
     TiffBuilder thumbnail;
-    thumbnail.u32(8).u16(1).entry(271, 2, 2, 0x41).u32(26);
-    thumbnail.u16(2).entry(513, 4, 1, 0x7ffffff0).entry(514, 4, 1, 0x7fffffff).u32(0);
-    QTest::newRow("thumbnail outside the block") << app1(thumbnail.data) << QList<int>{271} << QList<int>() << 0;
-    TiffBuilder good;
-    good.u32(8).u16(1).entry(271, 2, 2, 0x41).u32(26);
-    good.u16(2).entry(513, 4, 1, 56).entry(514, 4, 1, 4).u32(0).data.append("\xff\xd8\xff\xd9");
-    QTest::newRow("thumbnail inside the block") << app1(good.data) << QList<int>{271} << QList<int>() << 4;
+    thumbnail.u32(8).u16(1).entry(271, 2, 2, 0x41).u32(26).u16(2);
+    row("thumbnail outside the block",
+        app1(TiffBuilder(thumbnail).entry(513, 4, 1, 0x7ffffff0).entry(514, 4, 1, 0x7fffffff).u32(0).data), {271});
+    thumbnail.entry(513, 4, 1, 56).entry(514, 4, 1, 4).u32(0).data.append("\xff\xd8\xff\xd9");
+    QTest::newRow("thumbnail inside the block") << app1(thumbnail.data) << QList<int>{271} << QList<int>() << 4;
 }
 
 void tst_QExifImageHeader::hardening()
@@ -571,8 +503,7 @@ void tst_QExifImageHeader::hardening()
     // Values that don't fit read as empty values of their type.
     for (int tag : imageTags) {
         const QExifValue value = header.imageValue(tag);
-        QVERIFY(!value.isNull());
-        QVERIFY(value.count() <= 2 || value.type() == QExifValue::Short);
+        QVERIFY(!value.isNull() && (value.count() <= 2 || value.type() == QExifValue::Short));
     }
 }
 

@@ -48,8 +48,6 @@ void tst_QExifValue::scalars()
     QCOMPARE(QExifValue(quint8(200)).toShort(), quint16(200));
     QCOMPARE(QExifValue(quint16(65000)).toLong(), 65000u);
     QCOMPARE(QExifValue(qint32(-1)).toLong(), 0xffffffffu);
-    QCOMPARE(QExifValue(QExifSRational(-3, 4)).toSignedRational(), QExifSRational(-3, 4));
-
     // Only one element makes a scalar, and a type mismatch gives an empty result.
     QCOMPARE(QExifValue(QVector<quint32>{1, 2}).toLong(), 0u);
     QCOMPARE(QExifValue(QVector<quint8>{1, 2}).toByte(), quint8(0));
@@ -58,9 +56,7 @@ void tst_QExifValue::scalars()
     QCOMPARE(QExifValue(qint32(5)).toLongVector(), QVector<quint32>());
     QCOMPARE(QExifValue(QExifURational(1, 2)).toSignedRational(), QExifSRational(0, 0));
     const QExifValue shortValue(quint16(5));
-    QVERIFY(shortValue.toByteArray().isEmpty());
-    QVERIFY(shortValue.toRationalVector().isEmpty());
-    QVERIFY(shortValue.toString().isNull());
+    QVERIFY(shortValue.toByteArray().isEmpty() && shortValue.toRationalVector().isEmpty() && shortValue.toString().isNull());
     QVERIFY(QExifValue().toByteArray().isNull());
 }
 

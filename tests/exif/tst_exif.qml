@@ -16,25 +16,13 @@ TestCase {
         var copier = createTemporaryObject(attributesComponent, testCase)
         copier.filePath = testDataFolder + "/exif/camera/Kodak_CX7530.jpg"
         copier.destFilePath = Loomkit.resolvedPath("$TEMP/" + name)
-        verify(copier.removeAll !== undefined)
         copier.remove("nothing")
         return copier.destFilePath
     }
 
-    function test_enums() {
-        compare(ExifInfo.ImageMake, 271)
-        compare(ExifInfo.ImageLensModel, 42035)
-        compare(ExifInfo.ExtendedSubjectDistanceRange, 1036)
-        compare(ExifInfo.GPSLatitude, 2)
-        compare(ExifInfo.GpsHorizontalPositionError, 31)
-    }
-
     function test_cameraFile() {
         var info = createTemporaryObject(exifComponent, testCase)
-        var changes = 0
-        info.exifChanged.connect(function() { changes++ })
         verify(info.load(testDataFolder + "/exif/camera/Kodak_CX7530.jpg"))
-        compare(changes, 1)
         verify(info.isExifValid)
         compare(info.fileName, "Kodak_CX7530.jpg")
         // The camera wrote no terminator, and the last byte of the count is dropped.
@@ -85,16 +73,12 @@ TestCase {
     function test_attributes() {
         var path = temporaryCopy("attributes.jpg")
         var attributes = createTemporaryObject(attributesComponent, testCase, { filePath: path })
-        compare(attributes.appMarker, 65514)
-        compare(attributes.signature, "ZETH")
         verify(attributes.setValue("note", "hello"))
         verify(attributes.setValue("map", { a: 1, b: [1, 2], c: { d: "e" } }))
         verify(attributes.setValue("number", 5))
         compare(attributes.value("note"), "hello")
         compare(attributes.value("map").b[1], 2)
         compare(attributes.value("map").c.d, "e")
-        compare(attributes.keys().length, 3)
-        compare(attributes.values().note, "hello")
         compare(Object.keys(attributes.values("n*")).sort(), ["note", "number"])
         // A number comes back as the bytes of its text.
         compare(new Uint8Array(attributes.value("number"))[0], 53)
