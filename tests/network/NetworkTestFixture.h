@@ -55,22 +55,17 @@ class SignalRecorder : public QObject
 public:
     explicit SignalRecorder(QObject *target)
     {
-        const QMetaObject *mo = target->metaObject();
         const QMetaMethod slot = metaObject()->method(metaObject()->indexOfSlot("record()"));
-        for (int i = QObject::staticMetaObject.methodCount(); i < mo->methodCount(); ++i) {
-            const QMetaMethod method = mo->method(i);
-            if (method.methodType() == QMetaMethod::Signal)
-                connect(target, method, this, slot);
+        for (int i = QObject::staticMetaObject.methodCount(); i < target->metaObject()->methodCount(); ++i) {
+            if (target->metaObject()->method(i).methodType() == QMetaMethod::Signal)
+                connect(target, target->metaObject()->method(i), this, slot);
         }
     }
 
     QStringList names;
 
 public slots:
-    void record()
-    {
-        names.append(QString::fromLatin1(sender()->metaObject()->method(senderSignalIndex()).name()));
-    }
+    void record() { names.append(QString::fromLatin1(sender()->metaObject()->method(senderSignalIndex()).name())); }
 };
 
 #endif // NETWORKTESTFIXTURE_H

@@ -9,84 +9,66 @@ class tst_NetworkProxy : public QObject
     Q_OBJECT
 
 private slots:
-    void init();
-    void urlSetsProxy_data();
-    void urlSetsProxy();
-    void typeAndSystemSwitch();
-};
-
-void tst_NetworkProxy::init()
-{
-    // Setting an application proxy drops the system factory: in this order.
-    QNetworkProxy::setApplicationProxy(QNetworkProxy(QNetworkProxy::DefaultProxy));
-    QNetworkProxyFactory::setUseSystemConfiguration(true);
-}
-
-void tst_NetworkProxy::urlSetsProxy_data()
-{
-    QTest::addColumn<QUrl>("url");
-    QTest::addColumn<int>("type");
-    QTest::addColumn<QString>("host");
-    QTest::addColumn<int>("port");
-    QTest::newRow("host and port") << QUrl("http://proxy.example:3128") << int(QNetworkProxy::HttpProxy)
-                                   << "proxy.example" << 3128;
-    QTest::newRow("no port is 65535") << QUrl("http://proxy.example") << int(QNetworkProxy::HttpProxy)
-                                      << "proxy.example" << 65535;
-    QTest::newRow("empty") << QUrl() << int(QNetworkProxy::NoProxy) << "" << 0;
-    QTest::newRow("port 0") << QUrl("http://proxy.example:0") << int(QNetworkProxy::NoProxy) << "" << 0;
-}
-
-void tst_NetworkProxy::urlSetsProxy()
-{
-    QFETCH(QUrl, url);
-    QFETCH(int, type);
-    QFETCH(QString, host);
-    QFETCH(int, port);
-    NetworkProxy proxy;
-    QSignalSpy urlSpy(&proxy, &NetworkProxy::urlChanged);
-    proxy.setUrl(url);
-    QCOMPARE(urlSpy.count(), 1);
-    QVERIFY(!proxy.useSystemProxy());
-    QVERIFY(!QNetworkProxyFactory::usesSystemConfiguration());
-    const QNetworkProxy application = QNetworkProxy::applicationProxy();
-    QCOMPARE(int(application.type()), type);
-    if (type == QNetworkProxy::HttpProxy) {
-        QCOMPARE(application.hostName(), host);
-        QCOMPARE(int(application.port()), port);
-        QCOMPARE(proxy.url(), QUrl(QStringLiteral("http://%1:%2").arg(host).arg(port)));
-    } else {
-        QVERIFY(proxy.url().isEmpty());
+    void init()
+    {
+        // Setting an application proxy drops the system factory: in this order.
+        QNetworkProxy::setApplicationProxy(QNetworkProxy(QNetworkProxy::DefaultProxy));
+        QNetworkProxyFactory::setUseSystemConfiguration(true);
     }
-}
 
-void tst_NetworkProxy::typeAndSystemSwitch()
-{
-    NetworkProxy proxy;
-    QSignalSpy systemSpy(&proxy, &NetworkProxy::useSystemProxyChanged);
-    QSignalSpy urlSpy(&proxy, &NetworkProxy::urlChanged);
-    proxy.setUseSystemProxy(true); // unchanged: nothing fires
-    QCOMPARE(systemSpy.count(), 0);
-    proxy.setUseSystemProxy(false);
-    QCOMPARE(systemSpy.count(), 1);
-    QCOMPARE(urlSpy.count(), 0);
+    void urlSetsProxy_data()
+    {
+        QTest::addColumn<QUrl>("url");
+        QTest::addColumn<QUrl>("readBack"); // empty: no proxy
+        QTest::newRow("host and port") << QUrl("http://proxy.example:3128") << QUrl("http://proxy.example:3128");
+        QTest::newRow("no port is 65535") << QUrl("http://proxy.example") << QUrl("http://proxy.example:65535");
+        QTest::newRow("empty") << QUrl() << QUrl();
+        QTest::newRow("port 0") << QUrl("http://proxy.example:0") << QUrl();
+    }
 
-    // Another type keeps the host; only an HTTP proxy reads back as a URL.
-    proxy.setUrl(QUrl("http://proxy.example:8080"));
-    proxy.setType(NetworkProxy::Socks5Proxy);
-    QCOMPARE(QNetworkProxy::applicationProxy().type(), QNetworkProxy::Socks5Proxy);
-    QCOMPARE(QNetworkProxy::applicationProxy().hostName(), QStringLiteral("proxy.example"));
-    QVERIFY(proxy.url().isEmpty());
+    void urlSetsProxy()
+    {
+        QFETCH(QUrl, url);
+        QFETCH(QUrl, readBack);
+        NetworkProxy proxy;
+        QSignalSpy urlSpy(&proxy, &NetworkProxy::urlChanged);
+        proxy.setUrl(url);
+        QCOMPARE(urlSpy.count(), 1);
+        QVERIFY(!QNetworkProxyFactory::usesSystemConfiguration());
+        QCOMPARE(QNetworkProxy::applicationProxy().type(),
+                 readBack.isEmpty() ? QNetworkProxy::NoProxy : QNetworkProxy::HttpProxy);
+        QCOMPARE(proxy.url(), readBack);
+    }
 
-    // Back to the system: the URL read from the application proxy goes.
-    QNetworkProxy::setApplicationProxy(QNetworkProxy(QNetworkProxy::HttpProxy, "app.example", 1080));
-    QCOMPARE(proxy.url(), QUrl("http://app.example:1080"));
-    urlSpy.clear();
-    proxy.setUseSystemProxy(true);
-    QCOMPARE(systemSpy.count(), 2);
-    QCOMPARE(urlSpy.count(), 1);
-    QVERIFY(proxy.url().isEmpty());
-    QVERIFY(QNetworkProxyFactory::usesSystemConfiguration());
-}
+    void typeAndSystemSwitch()
+    {
+        NetworkProxy proxy;
+        QSignalSpy systemSpy(&proxy, &NetworkProxy::useSystemProxyChanged);
+        QSignalSpy urlSpy(&proxy, &NetworkProxy::urlChanged);
+        proxy.setUseSystemProxy(true); // unchanged: nothing fires
+        QCOMPARE(systemSpy.count(), 0);
+        proxy.setUseSystemProxy(false);
+        QCOMPARE(systemSpy.count(), 1);
+        QCOMPARE(urlSpy.count(), 0);
+
+        // Another type keeps the host; only an HTTP proxy reads back as a URL.
+        proxy.setUrl(QUrl("http://proxy.example:8080"));
+        proxy.setType(NetworkProxy::Socks5Proxy);
+        QCOMPARE(QNetworkProxy::applicationProxy().type(), QNetworkProxy::Socks5Proxy);
+        QCOMPARE(QNetworkProxy::applicationProxy().hostName(), QStringLiteral("proxy.example"));
+        QVERIFY(proxy.url().isEmpty());
+
+        // Back to the system: the URL read from the application proxy goes.
+        QNetworkProxy::setApplicationProxy(QNetworkProxy(QNetworkProxy::HttpProxy, "app.example", 1080));
+        QCOMPARE(proxy.url(), QUrl("http://app.example:1080"));
+        urlSpy.clear();
+        proxy.setUseSystemProxy(true);
+        QCOMPARE(systemSpy.count(), 2);
+        QCOMPARE(urlSpy.count(), 1);
+        QVERIFY(proxy.url().isEmpty());
+        QVERIFY(QNetworkProxyFactory::usesSystemConfiguration());
+    }
+};
 
 QTEST_MAIN(tst_NetworkProxy)
 

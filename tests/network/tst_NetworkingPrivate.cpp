@@ -6,8 +6,8 @@
 
 #include <QNetworkConfigurationManager>
 #include <QNetworkProxyFactory>
-#include <QSignalSpy>
 #include <QRegularExpression>
+#include <QSignalSpy>
 #include <QTest>
 #include <QThread>
 
@@ -17,125 +17,119 @@ class tst_NetworkingPrivate : public QObject
 {
     Q_OBJECT
 
-private slots:
-    void proxyFollowsSettings();
-    void invokerFindsAndRelays();
-    void serviceOnAnotherThread();
-    void configurationChangeAbortsRequest();
-};
-
-void tst_NetworkingPrivate::proxyFollowsSettings()
-{
-    NetworkingPrivate service;
-    QSignalSpy proxySpy(&service, &NetworkingPrivate::proxyChanged);
-    QSignalSpy urlSpy(&service, &NetworkingPrivate::requestUrlChanged);
-    QNetworkProxy::setApplicationProxy(QNetworkProxy(QNetworkProxy::HttpProxy, "app.example", 8080));
-    service.setUseSystemProxy(false);
-    QCOMPARE(service.queryProxy().hostName(), QStringLiteral("app.example"));
-    QCOMPARE(proxySpy.count(), 1);
-    service.setRequestUrl(QUrl("http://x.example/"));
-    QCOMPARE(urlSpy.count(), 1);
-    QCOMPARE(proxySpy.count(), 1); // the same proxy: no signal
-
-    // The system's answer for a URL, with no proxy in the environment.
-    qunsetenv("http_proxy");
-    service.setUseSystemProxy(true);
-    QVERIFY(service.queryProxy().type() == QNetworkProxy::NoProxy
-            || service.queryProxy().type() == QNetworkProxy::DefaultProxy);
-    QNetworkProxy::setApplicationProxy(QNetworkProxy());
-}
-
-void tst_NetworkingPrivate::invokerFindsAndRelays()
-{
-    // No service, or something that is no object: no target, and no crash.
-    for (const QVariant &published : { QVariant(), QVariant(QStringLiteral("text")) }) {
-        QCoreApplication::instance()->setProperty(NetworkingPrivate::propertyName, published);
-        NetworkingPrivateInvoker invoker;
-        QVERIFY(!invoker.target());
-        QVERIFY(!invoker.queryDefaultConfiguration().isValid());
-        invoker.setRequestUrl(QUrl("http://nowhere/"));
+    static void publish(const QVariant &service)
+    {
+        QCoreApplication::instance()->setProperty(NetworkingPrivate::propertyName, service);
     }
 
-    NetworkingPrivate service;
-    QCoreApplication::instance()->setProperty(NetworkingPrivate::propertyName, QVariant::fromValue<QObject *>(&service));
-    NetworkingPrivateInvoker invoker;
-    QCOMPARE(invoker.target(), &service);
-    QSignalSpy clearingSpy(&invoker, &NetworkingPrivateInvoker::accessCacheClearing);
-    QSignalSpy clearedSpy(&invoker, &NetworkingPrivateInvoker::accessCacheCleared);
-    QSignalSpy urlSpy(&invoker, &NetworkingPrivateInvoker::requestUrlChanged);
-    service.emitAccessCacheClearing();
-    service.emitAccessCacheCleared();
-    invoker.setRequestUrl(QUrl("http://a.example/"));
-    QCOMPARE(clearingSpy.count(), 1);
-    QCOMPARE(clearedSpy.count(), 1);
-    QCOMPARE(urlSpy.count(), 1);
-    QCOMPARE(service.queryRequestUrl(), QUrl("http://a.example/"));
+private slots:
+    void proxyFollowsSettings()
+    {
+        NetworkingPrivate service;
+        QSignalSpy proxySpy(&service, &NetworkingPrivate::proxyChanged);
+        QNetworkProxy::setApplicationProxy(QNetworkProxy(QNetworkProxy::HttpProxy, "app.example", 8080));
+        service.setUseSystemProxy(false);
+        QCOMPARE(service.queryProxy().hostName(), QStringLiteral("app.example"));
+        service.setRequestUrl(QUrl("http://x.example/"));
+        QCOMPARE(proxySpy.count(), 1); // the same proxy again: no signal
 
-    // A new target: the old one is no longer heard.
-    NetworkingPrivate other;
-    invoker.setTarget(&other);
-    service.emitAccessCacheClearing();
-    other.emitAccessCacheClearing();
-    QCOMPARE(clearingSpy.count(), 2);
-    QCoreApplication::instance()->setProperty(NetworkingPrivate::propertyName, QVariant());
-}
+        // The system's answer for a URL, with no proxy in the environment.
+        qunsetenv("http_proxy");
+        service.setUseSystemProxy(true);
+        QVERIFY(service.queryProxy().type() == QNetworkProxy::NoProxy
+                || service.queryProxy().type() == QNetworkProxy::DefaultProxy);
+        QNetworkProxy::setApplicationProxy(QNetworkProxy());
+    }
 
-void tst_NetworkingPrivate::serviceOnAnotherThread()
-{
-    QThread thread;
-    auto *service = new NetworkingPrivate;
-    service->moveToThread(&thread);
-    thread.start();
-    NetworkingPrivateInvoker invoker;
-    invoker.setTarget(service);
+    void invokerFindsAndRelays()
+    {
+        // No service, or something that is no object: no target, and no crash.
+        for (const QVariant &published : { QVariant(), QVariant(QStringLiteral("text")) }) {
+            publish(published);
+            NetworkingPrivateInvoker invoker;
+            QVERIFY(!invoker.target());
+            QVERIFY(!invoker.queryDefaultConfiguration().isValid());
+            invoker.setRequestUrl(QUrl("http://nowhere/"));
+        }
 
-    // Fire-and-forget works across threads; a query with a result does not.
-    invoker.setRequestUrl(QUrl("http://threaded.example/"));
-    QTRY_COMPARE(service->property("requestUrl").toUrl(), QUrl("http://threaded.example/"));
-    QTest::ignoreMessage(QtWarningMsg, QRegularExpression("Unable to invoke methods with return values"));
-    QVERIFY(!invoker.queryDefaultConfiguration().isValid());
+        NetworkingPrivate service;
+        publish(QVariant::fromValue<QObject *>(&service));
+        NetworkingPrivateInvoker invoker;
+        QCOMPARE(invoker.target(), &service);
+        QSignalSpy clearingSpy(&invoker, &NetworkingPrivateInvoker::accessCacheClearing);
+        QSignalSpy clearedSpy(&invoker, &NetworkingPrivateInvoker::accessCacheCleared);
+        QSignalSpy urlSpy(&invoker, &NetworkingPrivateInvoker::requestUrlChanged);
+        service.emitAccessCacheClearing();
+        service.emitAccessCacheCleared();
+        invoker.setRequestUrl(QUrl("http://a.example/"));
+        QCOMPARE(clearingSpy.count(), 1);
+        QCOMPARE(clearedSpy.count(), 1);
+        QCOMPARE(urlSpy.count(), 1);
+        QCOMPARE(service.queryRequestUrl(), QUrl("http://a.example/"));
 
-    QSignalSpy clearingSpy(&invoker, &NetworkingPrivateInvoker::accessCacheClearing);
-    QMetaObject::invokeMethod(service, "emitAccessCacheClearing", Qt::QueuedConnection);
-    QTRY_COMPARE(clearingSpy.count(), 1);
+        // A new target: the old one is no longer heard.
+        NetworkingPrivate other;
+        invoker.setTarget(&other);
+        service.emitAccessCacheClearing();
+        other.emitAccessCacheClearing();
+        QCOMPARE(clearingSpy.count(), 2);
+        publish(QVariant());
+    }
 
-    QMetaObject::invokeMethod(service, "deleteLater", Qt::QueuedConnection);
-    thread.quit();
-    thread.wait();
-}
+    void serviceOnAnotherThread()
+    {
+        QThread thread;
+        auto *service = new NetworkingPrivate;
+        service->moveToThread(&thread);
+        thread.start();
+        NetworkingPrivateInvoker invoker;
+        invoker.setTarget(service);
 
-void tst_NetworkingPrivate::configurationChangeAbortsRequest()
-{
-    QNetworkConfigurationManager manager;
-    QNetworkConfiguration valid = manager.defaultConfiguration();
-    if (!valid.isValid() && !manager.allConfigurations().isEmpty())
-        valid = manager.allConfigurations().first();
-    if (!valid.isValid())
-        QSKIP("this machine has no network configuration");
+        // Fire-and-forget works across threads; a query with a result does not.
+        invoker.setRequestUrl(QUrl("http://threaded.example/"));
+        QTRY_COMPARE(service->property("requestUrl").toUrl(), QUrl("http://threaded.example/"));
+        QTest::ignoreMessage(QtWarningMsg, QRegularExpression("Unable to invoke methods with return values"));
+        QVERIFY(!invoker.queryDefaultConfiguration().isValid());
+        QSignalSpy clearingSpy(&invoker, &NetworkingPrivateInvoker::accessCacheClearing);
+        QMetaObject::invokeMethod(service, "emitAccessCacheClearing", Qt::QueuedConnection);
+        QTRY_COMPARE(clearingSpy.count(), 1);
 
-    NetworkingPrivate *service = NetworkingPrivate::publish();
-    service->setDefaultConfiguration(valid);
-    QQmlEngine engine;
-    TestHttpServer server;
-    QVERIFY(server.start());
-    NetworkRequest *quiet = makeRequest(&engine, this);
-    NetworkRequest *live = makeRequest(&engine, this);
-    quiet->setUrl(QUrl(server.urlFor("/hang")));
-    live->setUrl(QUrl(server.urlFor("/hang")));
-    live->send();
+        QMetaObject::invokeMethod(service, "deleteLater", Qt::QueuedConnection);
+        thread.quit();
+        thread.wait();
+    }
 
-    // The same configuration again changes nothing; another aborts.
-    QSignalSpy errorSpy(live, &NetworkRequest::error);
-    service->setDefaultConfiguration(valid);
-    QCOMPARE(live->readyState(), NetworkRequest::ReadyStateSending);
-    service->setDefaultConfiguration(QNetworkConfiguration());
-    QCOMPARE(live->readyState(), NetworkRequest::ReadyStateComplete);
-    QCOMPARE(live->errorCode(), int(QNetworkReply::OperationCanceledError));
-    QCOMPARE(errorSpy.count(), 1);
-    QCOMPARE(quiet->readyState(), NetworkRequest::ReadyStateInitialized);
-    delete live;
-    delete quiet;
-}
+    void configurationChangeAbortsRequest()
+    {
+        QNetworkConfigurationManager manager;
+        QNetworkConfiguration valid = manager.defaultConfiguration();
+        if (!valid.isValid() && !manager.allConfigurations().isEmpty())
+            valid = manager.allConfigurations().first();
+        if (!valid.isValid())
+            QSKIP("this machine has no network configuration");
+
+        NetworkingPrivate *service = NetworkingPrivate::publish();
+        service->setDefaultConfiguration(valid);
+        QQmlEngine engine;
+        TestHttpServer server;
+        QVERIFY(server.start());
+        QScopedPointer<NetworkRequest> quiet(makeRequest(&engine));
+        QScopedPointer<NetworkRequest> live(makeRequest(&engine));
+        quiet->setUrl(QUrl(server.urlFor("/hang")));
+        live->setUrl(QUrl(server.urlFor("/hang")));
+        live->send();
+
+        // The same configuration again changes nothing; another aborts.
+        QSignalSpy errorSpy(live.data(), &NetworkRequest::error);
+        service->setDefaultConfiguration(valid);
+        QCOMPARE(live->readyState(), NetworkRequest::ReadyStateSending);
+        service->setDefaultConfiguration(QNetworkConfiguration());
+        QCOMPARE(live->readyState(), NetworkRequest::ReadyStateComplete);
+        QCOMPARE(live->errorCode(), int(QNetworkReply::OperationCanceledError));
+        QCOMPARE(errorSpy.count(), 1);
+        QCOMPARE(quiet->readyState(), NetworkRequest::ReadyStateInitialized);
+    }
+};
 
 QTEST_MAIN(tst_NetworkingPrivate)
 
