@@ -1,5 +1,6 @@
 #include "NetworkingPrivateInvoker.h"
 #include "LoomkitLogging.h"
+#include "NetworkingPrivate.h"
 
 #include <QCoreApplication>
 #include <QVariant>
@@ -27,7 +28,7 @@ NetworkingPrivateInvoker::NetworkingPrivateInvoker(QObject *parent)
     QCoreApplication *app = QCoreApplication::instance();
     if (!app)
         return;
-    const QVariant value = app->property("Orvane.Quorlo.Networking.Private");
+    const QVariant value = app->property(NetworkingPrivate::propertyName);
     if (!value.isValid() || value.isNull())
         return;
     QObject *object = value.value<QObject *>();
