@@ -12,7 +12,6 @@ private slots:
     void resolvedPath();
     void resolvedUrl_data();
     void resolvedUrl();
-    void pathUrl();
     void storePriority();
     void defaults();
     void realFiles();
@@ -93,12 +92,6 @@ void tst_FileUtility::resolvedUrl()
     QCOMPARE(result.isNull(), expected.isNull());
 }
 
-void tst_FileUtility::pathUrl()
-{
-    QCOMPARE(FileUtility::pathUrl(QStringLiteral(":/missing/x.png")), QUrl(QStringLiteral("qrc:///missing/x.png")));
-    QCOMPARE(FileUtility::pathUrl(QStringLiteral("/no/such/file")), QUrl::fromLocalFile(QStringLiteral("/no/such/file")));
-}
-
 void tst_FileUtility::storePriority()
 {
     const QString name = QStringLiteral("LOOMKIT_TEST_VAR");
@@ -160,6 +153,8 @@ void tst_FileUtility::realFiles()
     QVERIFY(QFile(QStringLiteral("~")).open(QIODevice::WriteOnly));
     QCOMPARE(FileUtility::resolvedPath(QStringLiteral("~"), true), QStringLiteral("~"));
     QCOMPARE(FileUtility::resolvedPath(QStringLiteral("~/x"), true), QStringLiteral("/home/tester/x"));
+    QCOMPARE(FileUtility::pathUrl(QStringLiteral(":/missing/x.png")), QUrl(QStringLiteral("qrc:///missing/x.png")));
+    QCOMPARE(FileUtility::pathUrl(QStringLiteral("/no/such/file")), QUrl::fromLocalFile(QStringLiteral("/no/such/file")));
 
     const QString nested = dir.filePath(QStringLiteral("a/b/c"));
     QVERIFY(FileUtility::makeFolder(nested));

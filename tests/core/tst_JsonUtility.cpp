@@ -10,8 +10,7 @@ private slots:
     void parse_data();
     void parse();
     void normalizeTurnsContainersPlain();
-    void toJsonDropsInvalid();
-    void fileRoundTrip();
+    void writing();
 };
 
 void tst_JsonUtility::parse_data()
@@ -56,7 +55,7 @@ void tst_JsonUtility::normalizeTurnsContainersPlain()
     QCOMPARE(map.value("text").userType(), int(QMetaType::QString));
 }
 
-void tst_JsonUtility::toJsonDropsInvalid()
+void tst_JsonUtility::writing()
 {
     const QVariantMap map {
         { "keep", 1 },
@@ -67,10 +66,7 @@ void tst_JsonUtility::toJsonDropsInvalid()
     QVERIFY(json.contains("\n    ")); // indented
     const QVariantMap expected { { "keep", 1.0 }, { "nested", QVariantMap { { "here", "x" } } } };
     QCOMPARE(JsonUtility::toVariantMap(json, false), expected);
-}
 
-void tst_JsonUtility::fileRoundTrip()
-{
     QTemporaryDir dir;
     const QString path = dir.filePath("a.json");
     QVERIFY(JsonUtility::toFile(path, QVariantMap { { "k", "v" } }));

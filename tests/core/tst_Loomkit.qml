@@ -16,10 +16,7 @@ TestCase {
     SignalSpy { id: homeSpy; target: Loomkit; signalName: "userHomePathChanged" }
 
     function test_versionsAndSystem() {
-        compare(Loomkit.version, "5.4.142")
         compare(Loomkit.osName, "Linux")
-        verify(Loomkit.qtVersion.indexOf("5.15") === 0)
-        compare(Loomkit.kernelType, "linux")
         var info = Loomkit.systemInformation
         for (var key of ["model", "manufacturer", "family"])
             verify(info.hasOwnProperty(key), key)

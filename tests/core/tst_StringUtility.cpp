@@ -10,8 +10,7 @@ class tst_StringUtility : public QObject
 private slots:
     void convert_data();
     void convert();
-    void undefinedEncoding();
-    void valueData();
+    void undefinedEncodingAndValues();
 };
 
 void tst_StringUtility::convert_data()
@@ -51,17 +50,14 @@ void tst_StringUtility::convert()
                                      TextEncoding(encoding)), text);
 }
 
-void tst_StringUtility::undefinedEncoding()
+void tst_StringUtility::undefinedEncodingAndValues()
 {
     // Decoding falls back to UTF-8, encoding gives nothing: deliberately different.
     QTest::ignoreMessage(QtWarningMsg, QRegularExpression(QStringLiteral("Undefined encoding: -1$")));
     QCOMPARE(StringUtility::toString(QByteArray("\xc3\xa9"), TextEncodingUnknown), QStringLiteral("é"));
     QTest::ignoreMessage(QtWarningMsg, QRegularExpression(QStringLiteral("Undefined encoding: 7$")));
     QCOMPARE(StringUtility::toStringData(QStringLiteral("é"), TextEncoding(7)), QByteArray());
-}
 
-void tst_StringUtility::valueData()
-{
     QJSEngine engine;
     QCOMPARE(StringUtility::toValueData(QJSValue(QStringLiteral("é")), TextEncodingLatin1), QByteArray("\xe9"));
     QCOMPARE(StringUtility::toValueData(QJSValue(QStringLiteral("é")), TextEncodingUtf8), QByteArray("\xc3\xa9"));
