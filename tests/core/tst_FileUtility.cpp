@@ -1,10 +1,5 @@
 #include "FileUtility.h"
 
-#include <QCoreApplication>
-#include <QDir>
-#include <QFileInfo>
-#include <QSettings>
-#include <QTemporaryDir>
 #include <QtTest>
 
 class tst_FileUtility : public QObject
@@ -15,32 +10,20 @@ private slots:
     void init();
     void resolvedPath_data();
     void resolvedPath();
-    void resolvedPathWarnings_data();
-    void resolvedPathWarnings();
-    void existingFileWins();
     void resolvedUrl_data();
     void resolvedUrl();
-    void pathUrl();
     void storePriority();
-    void homeDefaultIsStoredAndRecreated();
-    void pathVariableDefaults();
-    void makeFolder();
-    void setDateTime();
-
-private:
-    void clearVariables();
+    void defaults();
+    void realFiles();
 };
 
-static const char *kPrefix = "Orvane/Runtime/pathVariables.";
-
-void tst_FileUtility::clearVariables()
+static void clearVariables()
 {
     for (const QByteArray &name : qApp->dynamicPropertyNames()) {
-        if (name.startsWith(kPrefix))
+        if (name.startsWith("Orvane/Runtime/pathVariables."))
             qApp->setProperty(name.constData(), QVariant());
     }
-    QSettings settings;
-    settings.remove(QStringLiteral("Orvane/Runtime/pathVariables"));
+    QSettings().remove(QStringLiteral("Orvane/Runtime/pathVariables"));
     qunsetenv("LOOMKIT_TEST_VAR");
 }
 
@@ -59,144 +42,86 @@ void tst_FileUtility::resolvedPath_data()
 {
     QTest::addColumn<QString>("path");
     QTest::addColumn<QString>("expected");
+    QTest::addColumn<QString>("warning");
 
-    QTest::newRow("tilde") << "~" << "/home/tester";
-    QTest::newRow("tilde slash") << "~/a" << "/home/tester/a";
-    QTest::newRow("tilde names a variable") << "~data/b" << "/srv/data/b";
-    QTest::newRow("dollar") << "$TEMP/x" << "/var/tmp/t/x";
-    QTest::newRow("dollar whole") << "$data" << "/srv/data";
-    QTest::newRow("backslash separator kept") << "$TEMP\\x" << "/var/tmp/t\\x";
-    QTest::newRow("forward slash wins over earlier backslash") << "$TE\\MP/x" << "/x";
-    QTest::newRow("rule only at the start") << "a/$TEMP" << "a/$TEMP";
-    QTest::newRow("plain") << "/usr/share" << "/usr/share";
-    QTest::newRow("content") << "content://x/y" << "content://x/y";
-    QTest::newRow("empty name after dollar") << "$/x" << "/x";
-    QTest::newRow("missing variable") << "$NOPE/data" << "/data";
-    QTest::newRow("missing variable alone") << "$NOPE" << "";
-    QTest::newRow("lower-case home has no default") << "$home/x" << "/x";
+    QTest::newRow("tilde") << "~" << "/home/tester" << "";
+    QTest::newRow("tilde slash") << "~/a" << "/home/tester/a" << "";
+    QTest::newRow("tilde names a variable") << "~data/b" << "/srv/data/b" << "";
+    QTest::newRow("dollar") << "$TEMP/x" << "/var/tmp/t/x" << "";
+    QTest::newRow("dollar whole") << "$data" << "/srv/data" << "";
+    QTest::newRow("backslash separator kept") << "$TEMP\\x" << "/var/tmp/t\\x" << "";
+    QTest::newRow("forward slash wins over earlier backslash") << "$TE\\MP/x" << "/x" << "Nonexistent Path variable \"TE\\\\MP\"";
+    QTest::newRow("rule only at the start") << "a/$TEMP" << "a/$TEMP" << "";
+    QTest::newRow("plain") << "/usr/share" << "/usr/share" << "";
+    QTest::newRow("content") << "content://x/y" << "content://x/y" << "";
+    QTest::newRow("empty name after dollar") << "$/x" << "/x" << "Path variable name not specified";
+    QTest::newRow("missing variable") << "$NOPE/data" << "/data" << "Nonexistent Path variable \"NOPE\"";
+    QTest::newRow("missing variable alone") << "$NOPE" << "" << "Nonexistent Path variable \"NOPE\"";
+    QTest::newRow("lower-case home has no default") << "$home/x" << "/x" << "Nonexistent Path variable \"home\"";
 }
 
 void tst_FileUtility::resolvedPath()
 {
     QFETCH(QString, path);
-    QFETCH(QString, expected);
-    QCOMPARE(FileUtility::resolvedPath(path, true), expected);
-}
-
-void tst_FileUtility::resolvedPathWarnings_data()
-{
-    QTest::addColumn<QString>("path");
-    QTest::addColumn<QString>("warning");
-    QTest::newRow("no name") << "$/x" << "Path variable name not specified";
-    QTest::newRow("nonexistent") << "$NOPE" << "Nonexistent Path variable \"NOPE\"";
-    QTest::newRow("nonexistent with rest") << "$NOPE/data" << "Nonexistent Path variable \"NOPE\"";
-}
-
-void tst_FileUtility::resolvedPathWarnings()
-{
-    QFETCH(QString, path);
     QFETCH(QString, warning);
-    QTest::ignoreMessage(QtWarningMsg, QRegularExpression(QRegularExpression::escape(warning) + QLatin1Char('$')));
-    FileUtility::resolvedPath(path, true);
-}
-
-void tst_FileUtility::existingFileWins()
-{
-    QTemporaryDir dir;
-    QVERIFY(dir.isValid());
-    QDir::setCurrent(dir.path());
-    QFile tilde(QStringLiteral("~"));
-    QVERIFY(tilde.open(QIODevice::WriteOnly));
-    tilde.close();
-    QCOMPARE(FileUtility::resolvedPath(QStringLiteral("~"), true), QStringLiteral("~"));
-    QCOMPARE(FileUtility::resolvedPath(QStringLiteral("~/x"), true), QStringLiteral("/home/tester/x"));
-    QDir::setCurrent(QDir::tempPath());
+    if (!warning.isEmpty())
+        QTest::ignoreMessage(QtWarningMsg, QRegularExpression(QRegularExpression::escape(warning) + QLatin1Char('$')));
+    QTEST(FileUtility::resolvedPath(path, true), "expected");
 }
 
 void tst_FileUtility::resolvedUrl_data()
 {
-    QTest::addColumn<QUrl>("url");
+    QTest::addColumn<QString>("url");
     QTest::addColumn<QString>("expected");
-    QTest::newRow("qrc") << QUrl(QStringLiteral("qrc:/a/b.png")) << ":/a/b.png";
-    QTest::newRow("qrc encoded") << QUrl(QStringLiteral("qrc:/a%20b.png")) << ":/a b.png";
-    QTest::newRow("file") << QUrl(QStringLiteral("file:///c/d")) << "/c/d";
-    QTest::newRow("content") << QUrl(QStringLiteral("content://media/1")) << "content://media/1";
-    QTest::newRow("assets-library") << QUrl(QStringLiteral("assets-library://asset/a.JPG?id=1"))
-                                    << "assets-library://asset/a.JPG?id=1";
-    QTest::newRow("http loses host") << QUrl(QStringLiteral("http://example.com/p/q")) << "/p/q";
-    QTest::newRow("no path") << QUrl(QStringLiteral("http://example.com")) << QString();
-    QTest::newRow("relative with variable") << QUrl(QStringLiteral("$TEMP/x")) << "/var/tmp/t/x";
+    QTest::newRow("qrc") << "qrc:/a/b.png" << ":/a/b.png";
+    QTest::newRow("qrc encoded") << "qrc:/a%20b.png" << ":/a b.png";
+    QTest::newRow("file") << "file:///c/d" << "/c/d";
+    QTest::newRow("content") << "content://media/1" << "content://media/1";
+    QTest::newRow("assets-library") << "assets-library://asset/a.JPG?id=1" << "assets-library://asset/a.JPG?id=1";
+    QTest::newRow("http loses host") << "http://example.com/p/q" << "/p/q";
+    QTest::newRow("no path") << "http://example.com" << QString();
+    QTest::newRow("relative with variable") << "$TEMP/x" << "/var/tmp/t/x";
 }
 
 void tst_FileUtility::resolvedUrl()
 {
-    QFETCH(QUrl, url);
+    QFETCH(QString, url);
     QFETCH(QString, expected);
-    const QString result = FileUtility::resolvedPath(url, true);
+    const QString result = FileUtility::resolvedPath(QUrl(url), true);
     QCOMPARE(result, expected);
     QCOMPARE(result.isNull(), expected.isNull());
-}
-
-void tst_FileUtility::pathUrl()
-{
-    QCOMPARE(FileUtility::pathUrl(QStringLiteral(":/missing/x.png")), QUrl(QStringLiteral("qrc:///missing/x.png")));
-    QCOMPARE(FileUtility::pathUrl(QStringLiteral("/no/such/file")), QUrl::fromLocalFile(QStringLiteral("/no/such/file")));
-    QCOMPARE(FileUtility::qrcUrl(QStringLiteral(":/a/b")).toString(), QStringLiteral("qrc:///a/b"));
-    QCOMPARE(FileUtility::resolvedPathUrl(QStringLiteral("~/f.txt"), true),
-             QUrl::fromLocalFile(QStringLiteral("/home/tester/f.txt")));
 }
 
 void tst_FileUtility::storePriority()
 {
     const QString name = QStringLiteral("LOOMKIT_TEST_VAR");
-    QCOMPARE(FileUtility::pathVariableOrigin(name, true), FileUtility::PathVariableOriginNone);
+    const char *property = "Orvane/Runtime/pathVariables.LOOMKIT_TEST_VAR";
+    const auto expect = [&](bool useEnvironment, const QString &value, FileUtility::PathVariableOrigin origin) {
+        QCOMPARE(FileUtility::pathVariable(name, QString(), useEnvironment), value);
+        QCOMPARE(FileUtility::pathVariableOrigin(name, useEnvironment), origin);
+    };
+    expect(true, QString(), FileUtility::PathVariableOriginNone);
 
     qputenv("LOOMKIT_TEST_VAR", "/from/environment");
-    QCOMPARE(FileUtility::pathVariable(name, QString(), true), QStringLiteral("/from/environment"));
-    QCOMPARE(FileUtility::pathVariableOrigin(name, true), FileUtility::PathVariableOriginEnvironment);
+    expect(true, QStringLiteral("/from/environment"), FileUtility::PathVariableOriginEnvironment);
     // Without environment lookup only the application property counts.
-    QCOMPARE(FileUtility::pathVariable(name, QString(), false), QString());
-    QCOMPARE(FileUtility::pathVariableOrigin(name, false), FileUtility::PathVariableOriginNone);
+    expect(false, QString(), FileUtility::PathVariableOriginNone);
 
-    {
-        QSettings settings;
-        settings.setValue(QStringLiteral("Orvane/Runtime/pathVariables/") + name, QStringLiteral("  /from/settings  "));
-    }
-    QCOMPARE(FileUtility::pathVariable(name, QString(), true), QStringLiteral("/from/settings"));
-    QCOMPARE(FileUtility::pathVariableOrigin(name, true), FileUtility::PathVariableOriginSettings);
+    QSettings().setValue(QStringLiteral("Orvane/Runtime/pathVariables/") + name, QStringLiteral("  /from/settings  "));
+    expect(true, QStringLiteral("/from/settings"), FileUtility::PathVariableOriginSettings);
 
     FileUtility::setPathVariable(name, QStringLiteral("/from/property"));
-    QCOMPARE(FileUtility::pathVariable(name, QString(), true), QStringLiteral("/from/property"));
-    QCOMPARE(FileUtility::pathVariable(name, QString(), false), QStringLiteral("/from/property"));
-    QCOMPARE(FileUtility::pathVariableOrigin(name, false), FileUtility::PathVariableOriginApplicationProperty);
-    QCOMPARE(qApp->property("Orvane/Runtime/pathVariables.LOOMKIT_TEST_VAR").toString(), QStringLiteral("/from/property"));
+    expect(true, QStringLiteral("/from/property"), FileUtility::PathVariableOriginApplicationProperty);
+    expect(false, QStringLiteral("/from/property"), FileUtility::PathVariableOriginApplicationProperty);
+    QCOMPARE(qApp->property(property).toString(), QStringLiteral("/from/property"));
 
     // An empty value removes the property, and the next store shows through.
     FileUtility::setPathVariable(name, QString());
-    QVERIFY(!qApp->property("Orvane/Runtime/pathVariables.LOOMKIT_TEST_VAR").isValid());
-    QCOMPARE(FileUtility::pathVariable(name, QString(), true), QStringLiteral("/from/settings"));
+    QVERIFY(!qApp->property(property).isValid());
+    expect(true, QStringLiteral("/from/settings"), FileUtility::PathVariableOriginSettings);
 }
 
-void tst_FileUtility::homeDefaultIsStoredAndRecreated()
-{
-    clearVariables();
-    const QByteArray savedHome = qgetenv("HOME");
-    qunsetenv("HOME");
-    const char *property = "Orvane/Runtime/pathVariables.HOME";
-    QVERIFY(!qApp->property(property).isValid());
-
-    QCOMPARE(FileUtility::homePath(), QDir::homePath());
-    QCOMPARE(qApp->property(property).toString(), QDir::homePath());
-    QCOMPARE(FileUtility::pathVariableOrigin(QStringLiteral("HOME"), true), FileUtility::PathVariableOriginApplicationProperty);
-
-    FileUtility::setPathVariable(QStringLiteral("HOME"), QString());
-    QVERIFY(!qApp->property(property).isValid());
-    QCOMPARE(FileUtility::resolvedPath(QStringLiteral("~/x"), false), QDir::homePath() + QStringLiteral("/x"));
-    QCOMPARE(qApp->property(property).toString(), QDir::homePath());
-    qputenv("HOME", savedHome);
-}
-
-void tst_FileUtility::pathVariableDefaults()
+void tst_FileUtility::defaults()
 {
     QTest::ignoreMessage(QtWarningMsg, QRegularExpression(QStringLiteral("Empty name$")));
     QCOMPARE(FileUtility::pathVariable(QString(), QStringLiteral("fallback"), true), QStringLiteral("fallback"));
@@ -205,12 +130,32 @@ void tst_FileUtility::pathVariableDefaults()
     QCOMPARE(FileUtility::homePaths(), QStringList { QStringLiteral("/home/tester") });
     QTest::ignoreMessage(QtWarningMsg, QRegularExpression(QStringLiteral("Empty name, value= \"/x\"$")));
     FileUtility::setPathVariable(QString(), QStringLiteral("/x"));
+
+    // Without a HOME anywhere the built-in one is stored, and stored again once removed.
+    clearVariables();
+    const QByteArray savedHome = qgetenv("HOME");
+    qunsetenv("HOME");
+    const char *property = "Orvane/Runtime/pathVariables.HOME";
+    QCOMPARE(FileUtility::homePath(), QDir::homePath());
+    QCOMPARE(qApp->property(property).toString(), QDir::homePath());
+    QCOMPARE(FileUtility::pathVariableOrigin(QStringLiteral("HOME"), true), FileUtility::PathVariableOriginApplicationProperty);
+    FileUtility::setPathVariable(QStringLiteral("HOME"), QString());
+    QCOMPARE(FileUtility::resolvedPath(QStringLiteral("~/x"), false), QDir::homePath() + QStringLiteral("/x"));
+    QCOMPARE(qApp->property(property).toString(), QDir::homePath());
+    qputenv("HOME", savedHome);
 }
 
-void tst_FileUtility::makeFolder()
+void tst_FileUtility::realFiles()
 {
     QTemporaryDir dir;
-    QVERIFY(dir.isValid());
+    // A file of that name is taken as it is.
+    QDir::setCurrent(dir.path());
+    QVERIFY(QFile(QStringLiteral("~")).open(QIODevice::WriteOnly));
+    QCOMPARE(FileUtility::resolvedPath(QStringLiteral("~"), true), QStringLiteral("~"));
+    QCOMPARE(FileUtility::resolvedPath(QStringLiteral("~/x"), true), QStringLiteral("/home/tester/x"));
+    QCOMPARE(FileUtility::pathUrl(QStringLiteral(":/missing/x.png")), QUrl(QStringLiteral("qrc:///missing/x.png")));
+    QCOMPARE(FileUtility::pathUrl(QStringLiteral("/no/such/file")), QUrl::fromLocalFile(QStringLiteral("/no/such/file")));
+
     const QString nested = dir.filePath(QStringLiteral("a/b/c"));
     QVERIFY(FileUtility::makeFolder(nested));
     QVERIFY(QFileInfo(nested).isDir());
@@ -218,28 +163,15 @@ void tst_FileUtility::makeFolder()
     QVERIFY(FileUtility::makePath(QDir(dir.filePath(QStringLiteral("x/y")))));
     QVERIFY(QFileInfo(dir.filePath(QStringLiteral("x/y"))).isDir());
 
-    QFile blocker(dir.filePath(QStringLiteral("file")));
-    QVERIFY(blocker.open(QIODevice::WriteOnly));
-    blocker.close();
-    QVERIFY(!FileUtility::makeFolder(dir.filePath(QStringLiteral("file/sub"))));
-}
-
-void tst_FileUtility::setDateTime()
-{
-    QTemporaryDir dir;
-    QVERIFY(dir.isValid());
-    const QString path = dir.filePath(QStringLiteral("f"));
-    QFile file(path);
-    QVERIFY(file.open(QIODevice::WriteOnly));
-    file.close();
+    const QString path = dir.filePath(QStringLiteral("file"));
+    QVERIFY(QFile(path).open(QIODevice::WriteOnly));
+    QVERIFY(!FileUtility::makeFolder(path + QStringLiteral("/sub")));
 
     const QDateTime accessed = QDateTime::fromSecsSinceEpoch(1000000000);
     const QDateTime modified = QDateTime::fromMSecsSinceEpoch(1200000000123LL);
     QVERIFY(FileUtility::setDateTime(path, accessed, modified));
-    const QFileInfo info(path);
-    QCOMPARE(info.lastModified().toMSecsSinceEpoch(), 1200000000000LL); // sub-seconds are lost
-    QCOMPARE(info.lastRead().toSecsSinceEpoch(), 1000000000LL);
-
+    QCOMPARE(QFileInfo(path).lastModified().toMSecsSinceEpoch(), 1200000000000LL); // sub-seconds are lost
+    QCOMPARE(QFileInfo(path).lastRead().toSecsSinceEpoch(), 1000000000LL);
     QTest::ignoreMessage(QtWarningMsg, QRegularExpression(QStringLiteral("error: 2 file: \"/no/such/file\"")));
     QVERIFY(!FileUtility::setDateTime(QStringLiteral("/no/such/file"), accessed, modified));
 }

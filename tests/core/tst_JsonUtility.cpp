@@ -1,6 +1,5 @@
 #include "JsonUtility.h"
 
-#include <QTemporaryDir>
 #include <QtTest>
 
 class tst_JsonUtility : public QObject
@@ -8,54 +7,35 @@ class tst_JsonUtility : public QObject
     Q_OBJECT
 
 private slots:
-    void toVariant_data();
-    void toVariant();
-    void toVariantMap_data();
-    void toVariantMap();
+    void parse_data();
+    void parse();
     void normalizeTurnsContainersPlain();
-    void fromString();
-    void toJsonDropsInvalid();
-    void fileRoundTrip();
+    void writing();
 };
 
-void tst_JsonUtility::toVariant_data()
+void tst_JsonUtility::parse_data()
 {
     QTest::addColumn<QByteArray>("json");
-    QTest::addColumn<QVariant>("expected");
-    QTest::newRow("empty") << QByteArray() << QVariant();
-    QTest::newRow("array") << QByteArray("[1,2]") << QVariant(QVariantList { 1.0, 2.0 });
-    QTest::newRow("object") << QByteArray("{\"a\":\"b\"}") << QVariant(QVariantMap { { "a", "b" } });
-    QTest::newRow("broken gives empty map") << QByteArray("{\"a\":") << QVariant(QVariantMap());
+    QTest::addColumn<QVariant>("variant");
+    QTest::addColumn<QVariantMap>("map"); // toVariantMap and fromString take only objects
+    const QVariantMap object { { "n", 1.0 }, { "s", "x" }, { "z", QVariant::fromValue(nullptr) } };
+    QTest::newRow("empty") << QByteArray() << QVariant() << QVariantMap();
+    QTest::newRow("array") << QByteArray("[1,2]") << QVariant(QVariantList { 1.0, 2.0 }) << QVariantMap();
+    QTest::newRow("object") << QByteArray("{\"n\":1,\"s\":\"x\",\"z\":null}") << QVariant(object) << object;
+    QTest::newRow("broken gives empty map") << QByteArray("{\"a\":") << QVariant(QVariantMap()) << QVariantMap();
+    QTest::newRow("garbage") << QByteArray("nope") << QVariant(QVariantMap()) << QVariantMap();
 }
 
-void tst_JsonUtility::toVariant()
+void tst_JsonUtility::parse()
 {
     QFETCH(QByteArray, json);
-    QFETCH(QVariant, expected);
+    QFETCH(QVariant, variant);
+    QFETCH(QVariantMap, map);
     const QVariant result = JsonUtility::toVariant(json, false);
-    QCOMPARE(result.isValid(), expected.isValid());
-    QCOMPARE(result, expected);
-}
-
-void tst_JsonUtility::toVariantMap_data()
-{
-    QTest::addColumn<QByteArray>("json");
-    QTest::addColumn<QVariantMap>("expected");
-    QTest::newRow("empty") << QByteArray() << QVariantMap();
-    QTest::newRow("array is a failure") << QByteArray("[1,2]") << QVariantMap();
-    QTest::newRow("garbage") << QByteArray("nope") << QVariantMap();
-    QTest::newRow("object") << QByteArray("{\"n\":1,\"s\":\"x\",\"z\":null}")
-                            << QVariantMap { { "n", 1.0 }, { "s", "x" }, { "z", QVariant::fromValue(nullptr) } };
-}
-
-void tst_JsonUtility::toVariantMap()
-{
-    QFETCH(QByteArray, json);
-    QFETCH(QVariantMap, expected);
-    const QVariantMap result = JsonUtility::toVariantMap(json, false);
-    QCOMPARE(result.keys(), expected.keys());
-    for (const QString &key : expected.keys())
-        QCOMPARE(result.value(key).toString(), expected.value(key).toString());
+    QCOMPARE(result.isValid(), variant.isValid());
+    QCOMPARE(result, variant);
+    QCOMPARE(JsonUtility::toVariantMap(json, false), map);
+    QCOMPARE(JsonUtility::fromString(QString::fromUtf8(json)), map);
 }
 
 void tst_JsonUtility::normalizeTurnsContainersPlain()
@@ -71,21 +51,11 @@ void tst_JsonUtility::normalizeTurnsContainersPlain()
     QCOMPARE(map.value("hash").userType(), int(QMetaType::QVariantMap));
     QCOMPARE(map.value("strings").userType(), int(QMetaType::QVariantList));
     QCOMPARE(map.value("list").toList().first().userType(), int(QMetaType::QVariantMap));
-    QCOMPARE(map.value("list").toList().first().toMap().value("y").toInt(), 2);
     QVERIFY(!map.value("invalid").isValid());
     QCOMPARE(map.value("text").userType(), int(QMetaType::QString));
 }
 
-void tst_JsonUtility::fromString()
-{
-    QCOMPARE(JsonUtility::fromString(QString()), QVariantMap());
-    const QVariantMap map = JsonUtility::fromString(QStringLiteral("{\"a\":{\"b\":[1,{\"c\":NULL_is_text}]}}"));
-    QVERIFY(map.isEmpty()); // not JSON
-    const QVariantMap good = JsonUtility::fromString(QStringLiteral("{\"a\":{\"b\":[1,{\"c\":null}]}}"));
-    QCOMPARE(good.value("a").toMap().value("b").toList().at(1).userType(), int(QMetaType::QVariantMap));
-}
-
-void tst_JsonUtility::toJsonDropsInvalid()
+void tst_JsonUtility::writing()
 {
     const QVariantMap map {
         { "keep", 1 },
@@ -93,20 +63,11 @@ void tst_JsonUtility::toJsonDropsInvalid()
         { "nested", QVariantMap { { "gone", QVariant() }, { "here", "x" } } }
     };
     const QByteArray json = JsonUtility::toJson(map);
-    QVERIFY(!json.contains("drop"));
-    QVERIFY(!json.contains("gone"));
-    QVERIFY(!json.contains("null"));
     QVERIFY(json.contains("\n    ")); // indented
-    const QVariantMap back = JsonUtility::toVariantMap(json, false);
-    QCOMPARE(back.value("keep").toInt(), 1);
-    QCOMPARE(back.value("nested").toMap().value("here").toString(), QStringLiteral("x"));
-    QCOMPARE(back.value("nested").toMap().size(), 1);
-}
+    const QVariantMap expected { { "keep", 1.0 }, { "nested", QVariantMap { { "here", "x" } } } };
+    QCOMPARE(JsonUtility::toVariantMap(json, false), expected);
 
-void tst_JsonUtility::fileRoundTrip()
-{
     QTemporaryDir dir;
-    QVERIFY(dir.isValid());
     const QString path = dir.filePath("a.json");
     QVERIFY(JsonUtility::toFile(path, QVariantMap { { "k", "v" } }));
     QCOMPARE(JsonUtility::fromFile(path).value("k").toString(), QStringLiteral("v"));

@@ -3,9 +3,8 @@
 
 #include "TestSupport.h"
 
-#include <QFile>
 #include <QRandomGenerator>
-#include <QStringList>
+#include <QTemporaryDir>
 
 // Python with the Debian crypto module is the oracle for hashes and MACs: it
 // covers Keccak and MD4, which the openssl command line no longer offers.
@@ -20,24 +19,23 @@ inline QByteArray randomBytes(quint32 seed, int size)
     return bytes;
 }
 
-inline bool writeFile(const QString &path, const QByteArray &bytes)
+// Writes the inputs to the files "0", "1"... in dir and runs the script with
+// their paths as sys.argv[1..]. Empty when python3 or its crypto module is
+// missing, so the caller skips.
+inline QByteArray hexDigest(const QTemporaryDir &dir, const QString &script, const QList<QByteArray> &inputs)
 {
-    QFile file(path);
-    return file.open(QIODevice::WriteOnly) && file.write(bytes) == bytes.size();
-}
-
-// Runs the script with the files as sys.argv[1..]; empty when python3 or its
-// crypto module is missing, so the caller skips.
-inline QByteArray hexDigest(const QString &script, const QStringList &files)
-{
-    const QString python = QStringLiteral("/usr/bin/python3");
-    if (!QFile::exists(python))
-        return QByteArray();
+    QStringList paths;
+    for (const QByteArray &input : inputs) {
+        QFile file(dir.filePath(QString::number(paths.size())));
+        if (!file.open(QIODevice::WriteOnly) || file.write(input) != input.size())
+            return "cannot write " + file.fileName().toUtf8();
+        paths << file.fileName();
+    }
     int exitCode = 0;
     const QString prelude = QStringLiteral("import sys, hmac, hashlib\nfrom Cryptodome.Hash import keccak, MD4\n");
-    const QByteArray out = TestSupport::run(python, QStringList { QStringLiteral("-c"), prelude + script } + files,
-                                            &exitCode).trimmed();
-    return exitCode == 0 ? out : QByteArray();
+    const QByteArray out = TestSupport::run(QStringLiteral("/usr/bin/python3"),
+                                            QStringList { QStringLiteral("-c"), prelude + script } + paths, &exitCode);
+    return exitCode == 0 ? out.trimmed() : QByteArray();
 }
 
 } // namespace DigestOracle

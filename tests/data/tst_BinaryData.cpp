@@ -2,7 +2,6 @@
 
 #include <QJSEngine>
 #include <QQmlEngine>
-#include <QSignalSpy>
 #include <QtTest>
 
 class tst_BinaryData : public QObject
@@ -12,10 +11,7 @@ class tst_BinaryData : public QObject
 private slots:
     void typedRoundTrip_data();
     void typedRoundTrip();
-    void outOfRange();
-    void growing();
-    void encodings_data();
-    void encodings();
+    void outOfRangeAndGrowing();
     void base64AndHex_data();
     void base64AndHex();
     void badBase64AndHex();
@@ -38,10 +34,8 @@ void tst_BinaryData::typedRoundTrip_data()
     using B = BinaryData;
     row("int8 negative", B::TypeInt8, false, -2, "fe", -2);
     row("uint8 wraps", B::TypeUInt8, false, 257, "01", 1);
-    row("uint16 le", B::TypeUInt16, false, 4660, "3412", 4660);
     row("uint16 be", B::TypeUInt16, true, 4660, "1234", 4660);
     row("int16 be negative", B::TypeInt16, true, -2, "fffe", -2);
-    row("uint32 be", B::TypeUInt32, true, 305419896, "12345678", 305419896);
     row("uint32 max", B::TypeUInt32, false, 4294967295.0, "ffffffff", 4294967295.0);
     row("int32 le", B::TypeInt32, false, -1, "ffffffff", -1);
     row("int64 be", B::TypeInt64, true, -2, "fffffffffffffffe", -2);
@@ -71,15 +65,15 @@ void tst_BinaryData::typedRoundTrip()
     QTEST(read.toNumber(), "readBack");
 }
 
-void tst_BinaryData::outOfRange()
+void tst_BinaryData::outOfRangeAndGrowing()
 {
     BinaryData data;
     data.setHex(QStringLiteral("0102030405"));
     QSignalSpy dataSpy(&data, &BinaryData::dataChanged);
+    QSignalSpy sizeSpy(&data, &BinaryData::sizeChanged);
     QVERIFY(data.dataAt(4, BinaryData::TypeUInt16).isUndefined());
     QCOMPARE(data.dataAt(3, BinaryData::TypeUInt16, BinaryData::BigEndian).toInt(), 0x0405);
     QVERIFY(data.dataAt(-1).isUndefined());
-    QVERIFY(data.dataAt(5).isUndefined());
     QVERIFY(data.dataAt(2147483647, BinaryData::TypeDouble).isUndefined());
     // 10 is QMetaType::QString: a metatype, but not one of the buffer's types.
     QVERIFY(data.dataAt(0, BinaryData::Type(10)).isUndefined());
@@ -90,18 +84,10 @@ void tst_BinaryData::outOfRange()
     QCOMPARE(data.setDataAt(-1, QJSValue(7)), -1);
     QCOMPARE(data.hex(), QStringLiteral("0102030405"));
     QCOMPARE(dataSpy.count(), 0);
-}
-
-void tst_BinaryData::growing()
-{
-    BinaryData data;
-    data.setHex(QStringLiteral("aabbccdd"));
-    QSignalSpy sizeSpy(&data, &BinaryData::sizeChanged);
-    QSignalSpy dataSpy(&data, &BinaryData::dataChanged);
 
     QCOMPARE(data.setDataAt(10, QJSValue(1)), 11);
     // The gap is zero, not left over memory.
-    QCOMPARE(data.hex(), QStringLiteral("aabbccdd00000000000001"));
+    QCOMPARE(data.hex(), QStringLiteral("0102030405000000000001"));
     QCOMPARE(data.setDataAt(0, QJSValue(7)), 1);
     QCOMPARE(sizeSpy.count(), 1);
     QCOMPARE(dataSpy.count(), 2);
@@ -116,32 +102,6 @@ void tst_BinaryData::growing()
     data.setSize(-4);
     QVERIFY(data.isEmpty());
     QCOMPARE(sizeSpy.count(), 4);
-}
-
-void tst_BinaryData::encodings_data()
-{
-    QTest::addColumn<int>("encoding");
-    QTest::addColumn<QString>("text");
-    QTest::addColumn<QByteArray>("hex");
-
-    QTest::newRow("utf8") << int(BinaryData::TextEncodingUtf8) << QStringLiteral("h\u00e9\u20ac")
-                          << QByteArray("68c3a9e282ac");
-    QTest::newRow("latin1") << int(BinaryData::TextEncodingLatin1) << QStringLiteral("h\u00e9")
-                            << QByteArray("68e9");
-    QTest::newRow("utf16") << int(BinaryData::TextEncodingUtf16) << QStringLiteral("A\u20ac")
-                           << QByteArray("4100ac20");
-}
-
-void tst_BinaryData::encodings()
-{
-    QFETCH(int, encoding);
-    QFETCH(QString, text);
-    QFETCH(QByteArray, hex);
-
-    BinaryData data;
-    data.setStringData(text, BinaryData::TextEncoding(encoding));
-    QCOMPARE(data.hex().toLatin1(), hex);
-    QCOMPARE(data.stringData(BinaryData::TextEncoding(encoding)), text);
 }
 
 void tst_BinaryData::base64AndHex_data()
@@ -224,6 +184,14 @@ void tst_BinaryData::conversions()
 
     data.clear();
     QVERIFY(data.isNull());
+
+    // Text in an encoding other than the object's own.
+    data.setStringData(QStringLiteral("h\u00e9"), BinaryData::TextEncodingLatin1);
+    QCOMPARE(data.hex(), QStringLiteral("68e9"));
+    QCOMPARE(data.stringData(BinaryData::TextEncodingLatin1), QStringLiteral("h\u00e9"));
+    data.setStringData(QStringLiteral("A\u20ac"), BinaryData::TextEncodingUtf16);
+    QCOMPARE(data.hex(), QStringLiteral("4100ac20"));
+    QCOMPARE(data.stringData(BinaryData::TextEncodingUtf16), QStringLiteral("A\u20ac"));
 }
 
 QTEST_MAIN(tst_BinaryData)

@@ -4,8 +4,6 @@
 
 #include <QJSEngine>
 #include <QQmlEngine>
-#include <QSignalSpy>
-#include <QTemporaryDir>
 #include <QtTest>
 
 static const QString kAbc = QStringLiteral("ba7816bf8f01cfea414140de5dae2223b00361a396177a9cb410ff61f20015ad");
@@ -20,8 +18,7 @@ private slots:
     void knownVectors();
     void againstOracle_data();
     void againstOracle();
-    void streamState();
-    void inputKinds();
+    void streamStateAndInputs();
 };
 
 void tst_CryptographicHash::knownVectors_data()
@@ -32,24 +29,15 @@ void tst_CryptographicHash::knownVectors_data()
 
     using H = CryptographicHash;
     // RFC 1320, RFC 1321 and FIPS 180/202 sample values; Keccak as its authors published.
+    // They hold where python3 is missing; the oracle below covers every algorithm.
     QTest::newRow("md4 abc") << int(H::Md4) << QByteArray("abc") << "a448017aaf21d8525fc10ae87aa6729d";
     QTest::newRow("md5 empty") << int(H::Md5) << QByteArray() << "d41d8cd98f00b204e9800998ecf8427e";
     QTest::newRow("sha1 abc") << int(H::Sha1) << QByteArray("abc") << "a9993e364706816aba3e25717850c26c9cd0d89d";
-    QTest::newRow("sha256 abc") << int(H::Sha256) << QByteArray("abc")
-                                << "ba7816bf8f01cfea414140de5dae2223b00361a396177a9cb410ff61f20015ad";
     QTest::newRow("sha256 two blocks") << int(H::Sha256)
                                        << QByteArray("abcdbcdecdefdefgefghfghighijhijkijkljklmklmnlmnomnopnopq")
                                        << "248d6a61d20638b8e5c026930c3e6039a33ce45964ff2167f6ecedd419db06c1";
-    QTest::newRow("sha512 abc") << int(H::Sha512) << QByteArray("abc")
-                                << "ddaf35a193617abacc417349ae20413112e6fa4e89a97ea20a9eeee64b55d39a"
-                                   "2192992a274fc1a836ba3c23a3feebbd454d4423643ce80e2a9ac94fa54ca49f";
     QTest::newRow("sha3-256 empty") << int(H::Sha3_256) << QByteArray()
                                     << "a7ffc6f8bf1ed76651c14756a061d662f580ff4de43b49fa82d80a4b80f8434a";
-    QTest::newRow("sha3-512 abc") << int(H::Sha3_512) << QByteArray("abc")
-                                  << "b751850b1a57168a5693cd924b6b096e08f621827444f70d884f5d0240d2712e"
-                                     "10e116e9192af3c91a7ec57647e3934057340b4cf408d5a56592f8274eec53f0";
-    QTest::newRow("keccak-256 empty") << int(H::Keccak_256) << QByteArray()
-                                      << "c5d2460186f7233c927e7db2dcc703c0e500b653ca82273b7bfad8045d85a470";
     QTest::newRow("keccak-256 abc") << int(H::Keccak_256) << QByteArray("abc")
                                     << "4e03657aea45a94fc7d47ba826c8d667c0d1e6e33a64a036ec44f58fa12d6c45";
 }
@@ -99,20 +87,21 @@ void tst_CryptographicHash::againstOracle()
 
     // Odd sizes cross block boundaries and the 256 KiB read chunk.
     QTemporaryDir dir;
-    const QString path = dir.filePath(QStringLiteral("data.bin"));
-    QVERIFY(DigestOracle::writeFile(path, DigestOracle::randomBytes(algorithm + 11, 300 * 1024 + 7)));
+    const QByteArray data = DigestOracle::randomBytes(algorithm + 11, 300 * 1024 + 7);
     const QByteArray expected = DigestOracle::hexDigest(
-        QStringLiteral("d = open(sys.argv[1], 'rb').read()\nprint(%1.hexdigest())\n").arg(expression), { path });
+        dir, QStringLiteral("d = open(sys.argv[1], 'rb').read()\nprint(%1.hexdigest())\n").arg(expression), { data });
     if (expected.isEmpty())
         QSKIP("python3 with python3-pycryptodome is not installed");
-
     CryptographicHash hash;
     hash.setAlgorithm(CryptographicHash::Algorithm(algorithm));
-    QVERIFY(hash.addFile(path));
+    QVERIFY(hash.addFile(dir.filePath(QStringLiteral("0"))));
     QCOMPARE(hash.hex().toLatin1(), expected);
+    QCOMPARE(hash.hashLength(), expected.size() / 2);
+    QJSEngine engine;
+    QCOMPARE(hash.hash(engine.toScriptValue(data)).toLatin1(), expected); // the one-shot form
 }
 
-void tst_CryptographicHash::streamState()
+void tst_CryptographicHash::streamStateAndInputs()
 {
     CryptographicHash hash;
     QSignalSpy resultSpy(&hash, &CryptographicHash::resultChanged);
@@ -141,31 +130,25 @@ void tst_CryptographicHash::streamState()
     QTest::ignoreMessage(QtWarningMsg, QRegularExpression("Unsupported algorithm"));
     hash.setAlgorithm(CryptographicHash::Algorithm(99));
     QCOMPARE(hash.algorithm(), CryptographicHash::Md5);
-}
 
-void tst_CryptographicHash::inputKinds()
-{
     QJSEngine engine;
-    CryptographicHash fromBuffer;
-    QVERIFY(fromBuffer.addData(engine.evaluate(QStringLiteral("new Uint8Array([97, 98, 99]).buffer"))));
-    QCOMPARE(fromBuffer.hex(), kAbc);
-
+    const auto hexOf = [](const QJSValue &data) {
+        CryptographicHash hash;
+        return hash.addData(data) ? hash.hex() : QString();
+    };
+    QCOMPARE(hexOf(engine.evaluate(QStringLiteral("new Uint8Array([97, 98, 99]).buffer"))), kAbc);
     BinaryData bytes;
     bytes.setData(QByteArray("abc"));
     QQmlEngine::setObjectOwnership(&bytes, QQmlEngine::CppOwnership);
-    CryptographicHash fromObject;
-    QVERIFY(fromObject.addData(engine.newQObject(&bytes)));
-    QCOMPARE(fromObject.hex(), kAbc);
-
+    QCOMPARE(hexOf(engine.newQObject(&bytes)), kAbc);
     // Text is UTF-8.
-    CryptographicHash fromText;
-    QVERIFY(fromText.addData(QJSValue(QStringLiteral("\u00e9"))));
-    QCOMPARE(fromText.hex(), QStringLiteral("4a99557e4033c3539de2eb65472017cad5f9557f7a0625a09f1c3f6e2ba69c4c"));
+    QCOMPARE(hexOf(QJSValue(QStringLiteral("\u00e9"))),
+             QStringLiteral("4a99557e4033c3539de2eb65472017cad5f9557f7a0625a09f1c3f6e2ba69c4c"));
 
     QTest::ignoreMessage(QtWarningMsg, QRegularExpression("Unsupported data type"));
-    QVERIFY(!fromText.addData(QJSValue()));
+    QCOMPARE(hexOf(QJSValue()), QString());
     QTest::ignoreMessage(QtWarningMsg, QRegularExpression("Unsupported data type"));
-    QVERIFY(fromText.hash(engine.evaluate(QStringLiteral("({ a: 1 })"))).isEmpty());
+    QVERIFY(CryptographicHash().hash(engine.evaluate(QStringLiteral("({ a: 1 })"))).isEmpty());
 }
 
 QTEST_MAIN(tst_CryptographicHash)

@@ -1,7 +1,6 @@
 #include "InputValidator.h"
 
 #include <QJSEngine>
-#include <QSignalSpy>
 #include <QtTest>
 
 class tst_InputValidator : public QObject
@@ -11,8 +10,7 @@ class tst_InputValidator : public QObject
 private slots:
     void check_data();
     void check();
-    void functionSeesOnlyMatches();
-    void rewrites();
+    void functions();
 };
 
 void tst_InputValidator::check_data()
@@ -41,9 +39,7 @@ void tst_InputValidator::check_data()
     QTest::newRow("object") << "" << "(function (s) { return { state: s === 'ok' } })" << "ok" << ok << "";
     QTest::newRow("throws") << "" << "(function () { throw new Error('boom') })" << "x" << bad << "Error: boom";
     QTest::newRow("no result") << "" << "(function () { })" << "x" << bad << "Unexpected result";
-    QTest::newRow("both agree") << "[a-z]+" << "(function (s) { return s !== 'admin' })" << "user" << ok << "";
-    QTest::newRow("function says no") << "[a-z]+" << "(function (s) { return s !== 'admin' })" << "admin" << bad
-                                      << "";
+    QTest::newRow("function says no") << "[a-z]+" << "(function (s) { return s !== 'admin' })" << "admin" << bad << "";
     QTest::newRow("expression says no") << "[a-z]+" << "(function (s) { return true })" << "User" << bad << "";
 }
 
@@ -53,7 +49,6 @@ void tst_InputValidator::check()
     QFETCH(QString, script);
     QFETCH(QString, input);
     QFETCH(QString, warning);
-
     QJSEngine engine;
     InputValidator validator;
     if (!warning.isEmpty())
@@ -64,7 +59,7 @@ void tst_InputValidator::check()
     QTEST(validator.check(input), "state");
 }
 
-void tst_InputValidator::functionSeesOnlyMatches()
+void tst_InputValidator::functions()
 {
     QJSEngine engine;
     InputValidator validator;
@@ -81,12 +76,9 @@ void tst_InputValidator::functionSeesOnlyMatches()
     QCOMPARE(validator.check(QStringLiteral("X")), int(QValidator::Invalid));
     QCOMPARE(validator.check(QStringLiteral("x")), int(QValidator::Intermediate));
     QCOMPARE(calls.property(QStringLiteral("length")).toInt(), 1);
-}
 
-void tst_InputValidator::rewrites()
-{
-    QJSEngine engine;
-    InputValidator validator;
+    // The function may rewrite the text and move the cursor, within the text.
+    validator.setRegularExpression(QRegularExpression());
     validator.setValidateFunction(engine.evaluate(QStringLiteral(
         "(function (s, p) { return { state: 2, input: s.toUpperCase(), position: p + 100 } })")));
     QString input = QStringLiteral("abc");

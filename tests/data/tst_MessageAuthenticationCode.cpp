@@ -3,8 +3,6 @@
 #include "MessageAuthenticationCode.h"
 
 #include <QJSEngine>
-#include <QSignalSpy>
-#include <QTemporaryDir>
 #include <QtTest>
 
 // RFC 4231 test case 2.
@@ -30,40 +28,20 @@ void tst_MessageAuthenticationCode::rfc4231_data()
     QTest::addColumn<QString>("hex");
 
     using M = MessageAuthenticationCode;
-    const QByteArray key1(20, '\x0b');
-    const QByteArray key3(20, '\xaa');
-    QByteArray key4;
-    for (char c = 1; c <= 25; ++c)
-        key4 += c;
-    const QByteArray longKey(131, '\xaa');
+    const QByteArray jefe("Jefe"), want("what do ya want for nothing?"), longKey(131, '\xaa');
     const QByteArray data6("Test Using Larger Than Block-Size Key - Hash Key First");
-    const QByteArray data7("This is a test using a larger than block-size key and a larger than block-size data. "
-                           "The key needs to be hashed before being used by the HMAC algorithm.");
-
-    QTest::newRow("1 sha224") << key1 << QByteArray("Hi There") << int(M::Sha224)
+    QTest::newRow("1 sha224") << QByteArray(20, '\x0b') << QByteArray("Hi There") << int(M::Sha224)
                               << "896fb1128abbdf196832107cd49df33f47b4b1169912ba4f53684b22";
-    QTest::newRow("1 sha256") << key1 << QByteArray("Hi There") << int(M::Sha256)
-                              << "b0344c61d8db38535ca8afceaf0bf12b881dc200c9833da726e9376c2e32cff7";
-    QTest::newRow("2 sha256") << QByteArray("Jefe") << QByteArray("what do ya want for nothing?") << int(M::Sha256)
-                              << "5bdcc146bf60754e6a042426089575c75a003f089d2739839dec58b964ec3843";
-    QTest::newRow("2 sha384") << QByteArray("Jefe") << QByteArray("what do ya want for nothing?") << int(M::Sha384)
+    QTest::newRow("2 sha256") << jefe << want << int(M::Sha256) << kJefe;
+    QTest::newRow("2 sha384") << jefe << want << int(M::Sha384)
                               << "af45d2e376484031617f78d2b58a6b1b9c7ef464f5a01b47e42ec3736322445e"
                                  "8e2240ca5e69e2c78b3239ecfab21649";
-    QTest::newRow("3 sha512") << key3 << QByteArray(50, '\xdd') << int(M::Sha512)
-                              << "fa73b0089d56a284efb0f0756c890be9b1b5dbdd8ee81a3655f83e33b2279d39"
-                                 "bf3e848279a722c806b485a47e67c807b946a337bee8942674278859e13292fb";
-    QTest::newRow("4 sha256") << key4 << QByteArray(50, '\xcd') << int(M::Sha256)
-                              << "82558a389a443c0ea4cc819899f2083a85f0faa3e578f8077a2e3ff46729665b";
+    // Keys longer than the block are hashed first: blocks of 64 and of 128 bytes.
     QTest::newRow("6 sha256") << longKey << data6 << int(M::Sha256)
                               << "60e431591ee0b67f0d8a26aacbf5b77f8e0bc6213728c5140546040f0ee37f54";
     QTest::newRow("6 sha512") << longKey << data6 << int(M::Sha512)
                               << "80b24263c7c1a3ebb71493c1dd7be8b49b46d1f41b4aeec1121b013783f8f352"
                                  "6b56d037e05f2598bd0fd2215d6a1e5295e64f73f63f0aec8b915a985d786598";
-    QTest::newRow("7 sha224") << longKey << data7 << int(M::Sha224)
-                              << "3a854166ac5d9f023f54d517d0b39dbd946770db9c2b95c9f6f565d1";
-    QTest::newRow("7 sha384") << longKey << data7 << int(M::Sha384)
-                              << "6617178e941f020d351e2f254e8fd32c602420feb0b8fb9adccebb82461e99c5"
-                                 "a678cc31e799176d3860e6110c46523e";
 }
 
 void tst_MessageAuthenticationCode::rfc4231()
@@ -113,12 +91,7 @@ void tst_MessageAuthenticationCode::againstOracle()
     QFETCH(int, keySize);
 
     const QByteArray key = DigestOracle::randomBytes(keySize * 31 + algorithm, keySize);
-    QTemporaryDir dir;
-    const QString keyPath = dir.filePath(QStringLiteral("key"));
-    const QString dataPath = dir.filePath(QStringLiteral("data"));
-    QVERIFY(DigestOracle::writeFile(keyPath, key));
-    QVERIFY(DigestOracle::writeFile(dataPath, DigestOracle::randomBytes(algorithm, 5000)));
-
+    const QByteArray data = DigestOracle::randomBytes(algorithm, 5000);
     // Python's hmac does not take Keccak; the textbook construction over
     // the crypto module's Keccak stands in for it.
     const QString script = QStringLiteral(
@@ -130,15 +103,17 @@ void tst_MessageAuthenticationCode::againstOracle()
         "k = open(sys.argv[1], 'rb').read()\n"
         "d = open(sys.argv[2], 'rb').read()\n"
         "print(%1)\n").arg(oracle);
-    const QByteArray expected = DigestOracle::hexDigest(script, { keyPath, dataPath });
+    QTemporaryDir dir;
+    const QByteArray expected = DigestOracle::hexDigest(dir, script, { key, data });
     if (expected.isEmpty())
         QSKIP("python3 with python3-pycryptodome is not installed");
-
     MessageAuthenticationCode code;
     code.setAlgorithm(CryptographicHash::Algorithm(algorithm));
     code.setKeyBytes(key);
-    QVERIFY(code.addFile(dataPath));
+    QVERIFY(code.addFile(dir.filePath(QStringLiteral("1"))));
     QCOMPARE(code.hex().toLatin1(), expected);
+    QJSEngine engine;
+    QCOMPARE(code.hash(engine.toScriptValue(data)).toLatin1(), expected); // the one-shot form
 }
 
 void tst_MessageAuthenticationCode::keys()

@@ -35,7 +35,6 @@ TestCase {
     function test_versions() {
         verify(Loomkit.compareVersionNumber([1, 2], "1.2.0") < 0)
         compare(Loomkit.compareVersionNumber(version, "2.10.1"), 0)
-        compare(version.minorVersion, 10)
         var made = Loomkit.versionNumber(3, 0, 1)
         verify(made.compare(version) > 0)
         compare(Loomkit.versionNumber("4.5").segments, [4, 5])
@@ -46,7 +45,6 @@ TestCase {
         verify(hash.addData("ab"))
         verify(hash.addData(new Uint8Array([99]).buffer))
         compare(hash.hex, "a9993e364706816aba3e25717850c26c9cd0d89d")
-        compare(hash.result().hex, hash.hex)
         compare(mac.hash(Loomkit.binaryData("what do ya want for nothing?")),
                 "5bdcc146bf60754e6a042426089575c75a003f089d2739839dec58b964ec3843")
     }
@@ -64,7 +62,6 @@ TestCase {
     function test_locale() {
         compare(german.formatDate(new Date(2024, 2, 5), "d. MMMM yyyy"), "5. M\u00e4rz 2024")
         compare(Loomkit.localeInfo(Qt.locale("fr_FR")).name, "fr_FR")
-        compare(Loomkit.localeInfo("en_US").formatCurrency(3.5), "$3.50")
         compare(Loomkit.localeInfo(null).name, Qt.locale().name)
     }
 
